@@ -1,0 +1,96 @@
+#include "cli/console.h"
+
+#include <unistd.h>
+
+#include <cstdio>
+#include <cstdlib>
+
+#include "host/utf8.h"
+
+namespace {
+
+struct appearance {
+  const char* prefix;
+  const char* colour;
+};
+
+constexpr appearance appearance_of(Port_MsgLevel level) {
+  switch (level) {
+    case PORT_MSG_INFO:
+      return {"INFO: ", "\033[36m"};
+    case PORT_MSG_WARNING:
+      return {"WARNING: ", "\033[33m"};
+    case PORT_MSG_ERROR:
+      return {"ERROR: ", "\033[31m"};
+    case PORT_MSG_DEBUG:
+      return {"DEBUG: ", "\033[2m"};
+    default:
+      return {"", ""};
+  }
+}
+
+bool wants_colour() {
+  const char* no_colour = std::getenv("NO_COLOR");
+  return no_colour == nullptr || *no_colour == '\0';
+}
+
+}  // namespace
+
+console::console(bool debug)
+    : is_terminal_(::isatty(STDERR_FILENO) != 0),
+      colour_(is_terminal_ && wants_colour()),
+      before_(Port_MsgManData::setSink({show, this, debug})) {}
+
+console::~console() {
+  Port_MsgManData::setSink(before_);
+}
+
+void console::show(void* self, const Port_Msg& message) {
+  const appearance look = appearance_of(message.level);
+  const bool coloured = static_cast<console*>(self)->colour_ && *look.prefix != '\0';
+  std::string text;
+  if (coloured) text += look.colour;
+  text += look.prefix;
+  if (coloured) text += "\033[0m";
+  text += message.text;
+  if (!text.ends_with('\n')) text += '\n';
+  std::fwrite(text.data(), 1, text.size(), stderr);
+}
+
+status_to_output::status_to_output() : before_(Port_MsgManData::setSink({show, this, false})) {}
+
+status_to_output::~status_to_output() {
+  Port_MsgManData::setSink(before_);
+}
+
+void status_to_output::show(void* self, const Port_Msg& message) {
+  const Port_MsgSink& before = static_cast<status_to_output*>(self)->before_;
+  if (message.level == PORT_MSG_STATUS) {
+    std::fputs(message.text, stdout);
+  } else {
+    before.function(before.context, message);
+  }
+}
+
+void complain(const std::string& text) {
+  std::fprintf(stderr, "kestrel-launch: %s\n", text.c_str());
+}
+
+std::string json_string(std::string_view text) {
+  std::string quoted = "\"";
+  while (!text.empty()) {
+    const utf8_character c = first_character(text);
+    char escape[8];
+    if (!c.valid || c.code < 0x20 || c.code == 0x7F) {
+      const unsigned int code =
+          c.valid ? c.code : 0xDC00 + static_cast<unsigned char>(text.front());
+      std::snprintf(escape, sizeof escape, "\\u%04x", code);
+      quoted += escape;
+    } else {
+      if (c.code == '"' || c.code == '\\') quoted += '\\';
+      quoted += text.substr(0, c.bytes);
+    }
+    text.remove_prefix(c.bytes);
+  }
+  return quoted + "\"";
+}

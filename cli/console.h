@@ -1,0 +1,49 @@
+// What the command shows: messages on standard error, results on standard output.
+#ifndef KESTREL_CLI_CONSOLE_H
+#define KESTREL_CLI_CONSOLE_H
+
+#include <string>
+#include <string_view>
+
+#include "host/port_msgman.h"
+
+/// Shows messages on standard error, in colour on a terminal that wants it, until it is destroyed.
+class console {
+ public:
+  explicit console(bool debug);
+  console(const console&) = delete;
+  console& operator=(const console&) = delete;
+  ~console();
+
+  /// Whether standard error is a terminal.
+  bool is_terminal() const { return is_terminal_; }
+
+ private:
+  static void show(void* self, const Port_Msg& message);
+
+  bool is_terminal_;
+  bool colour_;
+  Port_MsgSink before_;
+};
+
+/// Sends status messages to standard output, until it is destroyed.
+class status_to_output {
+ public:
+  status_to_output();
+  status_to_output(const status_to_output&) = delete;
+  status_to_output& operator=(const status_to_output&) = delete;
+  ~status_to_output();
+
+ private:
+  static void show(void* self, const Port_Msg& message);
+
+  Port_MsgSink before_;
+};
+
+/// Says on standard error what the command itself has to say.
+void complain(const std::string& text);
+
+/// text as a JSON string. A byte that is not UTF-8 becomes the lone surrogate U+DC00 + byte.
+std::string json_string(std::string_view text);
+
+#endif

@@ -1,0 +1,162 @@
+// kestrel-launch: the launcher as a command.
+//
+//   settings   reads the command line; holds the table of options
+//   console    shows messages and makes JSON
+//   graph      draws the rules
+//   main       does what the command line asks for
+#include <cstdio>
+#include <cstdlib>
+#include <exception>
+#include <fstream>
+#include <iostream>
+#include <string>
+#include <vector>
+
+#include "cli/console.h"
+#include "cli/graph.h"
+#include "cli/settings.h"
+#include "host/port_file.h"
+#include "launcher/baslauncher.h"
+#include "rules/baslarules.h"
+
+namespace {
+
+enum exit_status { ALL_FOUND = 0, NOT_ALL_FOUND = 1, FAILED = 2 };
+
+/// Appends the names in a file, one per line. Returns an empty text, or what is wrong.
+std::string read_names(const std::string& file, std::vector<std::string>& names) {
+  std::ifstream opened;
+  const bool from_input = file == "-";
+  if (!from_input) opened.open(file);
+  std::istream& in = from_input ? std::cin : opened;
+  std::string line;
+  for (int number = 1; in && std::getline(in, line); ++number) {
+    if (line.ends_with('\r')) line.pop_back();
+    if (line.find('\0') != line.npos) {
+      return "--names-from: " + file + ", line " + std::to_string(number) + " holds a zero byte";
+    }
+    if (!line.empty()) names.push_back(line);
+  }
+  return in.eof() ? "" : "--names-from: could not read " + file;
+}
+
+/// Whether the directories that the settings name can be used.
+std::string check_directories(const settings& set) {
+  for (const char* dir : set.search_dirs) {
+    if (LA_DIR(dir).get_dir() == nullptr) {
+      return std::string("--search-dir: not the name of a directory: \"") + dir + "\"";
+    }
+  }
+  if (set.output_dir != nullptr && !Port::File::isdirectory(set.output_dir)) {
+    return std::string("--output-dir: there is no directory \"") + set.output_dir + "\"";
+  }
+  return {};
+}
+
+void print_totals(bool ok, int errors, int warnings) {
+  std::printf("{\"ok\":%s,\"errors\":%d,\"warnings\":%d}\n", ok ? "true" : "false", errors,
+              warnings);
+}
+
+void print_result(const settings& set, const std::string& name, short result, const char* source,
+                  const char* netlist) {
+  if (set.json) {
+    std::printf("{\"name\":%s,\"result\":%d,\"source\":%s,\"netlist\":%s}\n",
+                json_string(name).c_str(), result, json_string(source).c_str(),
+                json_string(netlist).c_str());
+  } else if (result == LA_FOUND) {
+    std::printf("%s\n", netlist);
+  }
+}
+
+int resolve(settings& set, const console& shown) {
+  const auto array = [](std::vector<const char*>& texts) {
+    return texts.empty() ? nullptr : texts.data();
+  };
+  LA_LAUNCHER launcher(set.part, array(set.search_dirs), static_cast<short>(set.search_dirs.size()),
+                       array(set.libraries), static_cast<short>(set.libraries.size()),
+                       set.output_dir, set.user_rules, set.force, set.ignore_timestamps,
+                       set.ignore_locs, set.add_pads, set.quiet, set.aul);
+  int status = launcher.ok ? ALL_FOUND : FAILED;
+  for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
+    const std::string& name = set.names[i];
+    if (shown.is_terminal() && set.names.size() > 1) {
+      std::fprintf(stderr, "[%zu/%zu] %s\n", i + 1, set.names.size(), name.c_str());
+    }
+    char source[LA_MAX_PATH];
+    char netlist[LA_MAX_PATH];
+    const short result = launcher.find(name.c_str(), source, netlist, set.top);
+    print_result(set, name, result, source, netlist);
+    if (result == LA_FAILED) status = FAILED;
+    if (result == LA_NOT_FOUND) {
+      complain("not found: " + name);
+      if (status == ALL_FOUND) status = NOT_ALL_FOUND;
+    }
+  }
+  if (set.json) print_totals(launcher.ok, launcher.errors, launcher.warnings);
+  return status;
+}
+
+int show_rules(const settings& set) {
+  const LA_RULE_SET rules(set.part, set.user_rules);
+  if (rules.is_valid && set.what == task::LIST_RULES) {
+    const status_to_output redirected;
+    rules.dump(set.detail);
+  }
+  if (rules.is_valid && set.what == task::GRAPH) std::fputs(graph_of(rules.rules).c_str(), stdout);
+  if (set.what == task::CHECK) {
+    if (set.json) print_totals(rules.is_valid, 0, 0);
+    if (!set.json && rules.is_valid) std::printf("%d rules, all good\n", rules.rules.count);
+  }
+  return rules.is_valid ? ALL_FOUND : FAILED;
+}
+
+int run(settings& set) {
+  // The library's switches.
+  if (set.dry_run) ::setenv("LA_TEST", "1", 1);
+  if (set.detail) ::setenv("LAUNCHER_DETAIL", "1", 1);
+  const console shown(set.debug);
+  switch (set.what) {
+    case task::HELP:
+      std::fputs(help_text().c_str(), stdout);
+      return ALL_FOUND;
+    case task::VERSION:
+      std::puts("kestrel-launch " KESTREL_VERSION);
+      return ALL_FOUND;
+    case task::RESOLVE:
+      return resolve(set, shown);
+    default:
+      return show_rules(set);
+  }
+}
+
+int run_command_line(int count, const char* const* words) {
+  settings set;
+  std::string wrong = read_command_line(count, words, set);
+  if (wrong.empty()) wrong = check_directories(set);
+  for (const char* file : set.names_files) {
+    if (wrong.empty() && set.what == task::RESOLVE) wrong = read_names(file, set.names);
+  }
+  if (!wrong.empty()) {
+    complain(wrong);
+    std::fputs("Try 'kestrel-launch --help'.\n", stderr);
+    return FAILED;
+  }
+  const int status = run(set);
+  if (std::fflush(stdout) != 0 || std::ferror(stdout) != 0) {
+    complain("could not write to standard output");
+    return FAILED;
+  }
+  return status;
+}
+
+}  // namespace
+
+int main(int count, char** words) {
+  try {
+    return run_command_line(count - 1, words + 1);
+  } catch (const std::exception& failure) {
+    complain(failure.what());
+    return FAILED;
+  }
+}

@@ -1,0 +1,151 @@
+#include "host/port_file.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <climits>
+#include <cstring>
+
+namespace Port {
+
+namespace {
+
+__int64 nanoseconds(const timespec& time) {
+  // The years 1678 to 2262 fit; a time stamp outside them counts as the end that it lies beyond.
+  constexpr __int64 SECOND = 1'000'000'000;
+  constexpr __int64 LIMIT = INT64_MAX / SECOND - 1;
+  return std::clamp<__int64>(time.tv_sec, -LIMIT, LIMIT) * SECOND + time.tv_nsec;
+}
+
+}  // namespace
+
+Stream::Stream(int descriptor) : descriptor_(descriptor), block_(new char[BLOCK]) {
+  fill();
+  static constexpr char BYTE_ORDER_MARK[] = {'\xEF', '\xBB', '\xBF'};
+  if (end_ - next_ >= 3 && std::memcmp(next_, BYTE_ORDER_MARK, 3) == 0) {
+    next_ += 3;
+    if (next_ == end_) fill();
+  }
+}
+
+Stream::~Stream() {
+  ::close(descriptor_);
+}
+
+void Stream::fill() {
+  ssize_t length = 0;
+  do {
+    length = ::read(descriptor_, block_.get(), BLOCK);
+  } while (length < 0 && errno == EINTR);
+  failed_ = length < 0;
+  next_ = block_.get();
+  end_ = next_ + std::max<ssize_t>(length, 0);
+}
+
+/// Hands the pieces of the next line to append. Returns whether a line end followed.
+template <class Append>
+bool Stream::read_pieces(Append append) {
+  bool ended = false;
+  while (!ended && next_ != end_) {
+    const char* stop = std::find(next_, end_, '\n');
+    ended = stop != end_;
+    append(next_, static_cast<int>(stop - next_));
+    next_ = ended ? stop + 1 : stop;
+    if (next_ == end_) fill();
+  }
+  return ended;
+}
+
+int Stream::readline(char* buffer, int size) {
+  int length = 0;
+  char last = '\0';
+  const bool ended = read_pieces([&](const char* piece, int piece_length) {
+    if (length < size) std::copy_n(piece, std::min(piece_length, size - length), buffer + length);
+    if (piece_length > 0) last = piece[piece_length - 1];
+    length = std::min(length, INT_MAX - BLOCK) + piece_length;
+  });
+  if (ended && last == '\r') --length;
+  buffer[std::min(length, size - 1)] = '\0';
+  return length;
+}
+
+void Stream::readline(std::string& line) {
+  line.clear();
+  const bool ended = read_pieces([&line](const char* piece, int length) {
+    line.append(piece, static_cast<std::size_t>(length));
+  });
+  if (ended && line.ends_with('\r')) line.pop_back();
+}
+
+FileStatus File::status(const char* path) {
+  struct stat found = {};
+  if (::stat(path, &found) != 0 || S_ISDIR(found.st_mode)) return {};
+  return {true, nanoseconds(found.st_mtim)};
+}
+
+bool File::exist(const char* path) {
+  return status(path).exists;
+}
+
+bool File::isdirectory(const char* path) {
+  struct stat found = {};
+  return ::stat(path, &found) == 0 && S_ISDIR(found.st_mode);
+}
+
+bool File::getdatetime(const char* path, __int64& time) {
+  const FileStatus found = status(path);
+  if (found.exists) time = found.time;
+  return found.exists;
+}
+
+bool File::chdir(const char* path) {
+  return ::chdir(path) == 0;
+}
+
+void File::getcwd(char* buffer, short size) {
+  // A directory that the process cannot reach is not spelled with a leading slash.
+  if (::getcwd(buffer, static_cast<std::size_t>(size)) == nullptr || buffer[0] != '/') {
+    buffer[0] = '\0';
+  }
+}
+
+void File::makeunixpath(char* path) {
+  std::replace(path, path + UT_STR::Len(path), '\\', '/');
+}
+
+const char* File::find(const char* name, const char** dirs, int count, char* found) {
+  static const char* here[] = {""};
+  if (name[0] == '/' || count == 0) {
+    dirs = here;
+    count = 1;
+  }
+  for (int i = 0; i < count; ++i) {
+    if (dirs[i] == nullptr || UT_STR::Copy(found, dirs[i]) == nullptr) continue;
+    if (UT_STR::Cat(found, name) != nullptr && exist(found)) return found;
+  }
+  found[0] = '\0';
+  return nullptr;
+}
+
+Stream* File::open(const char* path, Stream::Access access, bool /*flag*/) {
+  if (access != Stream::READ) return nullptr;
+  // Opening must not wait for the other end of a pipe.
+  const int descriptor = ::open(path, O_RDONLY | O_CLOEXEC | O_NONBLOCK);
+  if (descriptor < 0) return nullptr;
+  struct stat opened = {};
+  if (::fstat(descriptor, &opened) != 0 || !S_ISREG(opened.st_mode)) {
+    ::close(descriptor);
+    return nullptr;
+  }
+  return new Stream(descriptor);
+}
+
+bool File::close(Stream* stream) {
+  delete stream;
+  return true;
+}
+
+}  // namespace Port

@@ -1,0 +1,93 @@
+// Files and text streams.
+#ifndef KESTREL_HOST_PORT_FILE_H
+#define KESTREL_HOST_PORT_FILE_H
+
+#include <cstdint>
+#include <memory>
+#include <string>
+
+#include "host/ut_str.h"
+
+#if !defined(_MSC_VER)
+typedef std::int64_t __int64;  // NOLINT(bugprone-reserved-identifier)
+#endif
+
+namespace Port {
+
+/// A text file that is read line by line. Made by File::open, released by File::close.
+class Stream {
+ public:
+  enum Access { READ = 1 };
+
+  /// Takes over the file descriptor, which stands at the start of the file. A UTF-8 byte order
+  /// mark there is skipped.
+  explicit Stream(int descriptor);
+  Stream(const Stream&) = delete;
+  Stream& operator=(const Stream&) = delete;
+  ~Stream();
+
+  /// Reads the next line, without its line end ("\n" or "\r\n"), into buffer, which holds size
+  /// characters. Returns the length of the line. When that is size or more, the line did not fit:
+  /// the buffer then holds its start. When it is not the length of the string in the buffer, the
+  /// line holds a zero byte.
+  int readline(char* buffer, int size);
+  /// Reads the next line, of any length, likewise.
+  void readline(std::string& line);
+  /// True once every line has been read, or reading failed.
+  bool geteof() const { return next_ == end_; }
+  /// True when the file could not be read to its end.
+  bool failed() const { return failed_; }
+
+ private:
+  void fill();
+  template <class Append>
+  bool read_pieces(Append append);
+
+  static constexpr int BLOCK = 16384;
+
+  int descriptor_;
+  bool failed_ = false;
+  std::unique_ptr<char[]> block_;
+  const char* next_ = nullptr;
+  const char* end_ = nullptr;
+};
+
+/// What the file system knows of a name.
+struct FileStatus {
+  bool exists = false;  ///< there is such a file, and it is not a directory
+  __int64 time = 0;     ///< modification time, in nanoseconds since 1970; 0 when there is none
+};
+
+class File {
+ public:
+  /// Existence and modification time of path, with one question to the file system.
+  static FileStatus status(const char* path);
+  /// True when there is anything but a directory at path.
+  static bool exist(const char* path);
+  /// True when path is a directory.
+  static bool isdirectory(const char* path);
+  /// Sets time to the modification time of path, in nanoseconds since 1970. Returns false, and
+  /// leaves time alone, when there is no such file.
+  static bool getdatetime(const char* path, __int64& time);
+  /// Changes the current directory of the process. Returns false when that fails.
+  static bool chdir(const char* path);
+  /// Writes the current directory into buffer, which holds size characters; the empty string when
+  /// it cannot be determined or does not fit.
+  static void getcwd(char* buffer, short size);
+  /// Turns every backslash of path into a forward slash, in place.
+  static void makeunixpath(char* path);
+  /// Looks for name in the count directories, in their order; null entries are passed over, and a
+  /// count of 0 stands for the current directory. An absolute name is tested as it stands. Writes
+  /// the first path that exists into found, a buffer of LA_MAX_PATH characters, and returns it.
+  /// Returns null when there is none; found is then the empty string.
+  static const char* find(const char* name, const char** dirs, int count, char* found);
+  /// Opens the regular file at path for reading. Returns null when it cannot be opened or is
+  /// anything else. flag: not used.
+  static Stream* open(const char* path, Stream::Access access, bool flag);
+  /// Closes and releases stream.
+  static bool close(Stream* stream);
+};
+
+}  // namespace Port
+
+#endif

@@ -1,0 +1,110 @@
+#include "host/port_msgman.h"
+
+#include <cstdio>
+#include <string>
+
+#include "host/utf8.h"
+
+namespace {
+
+void write_to_stderr(void* /*context*/, const Port_Msg& message) {
+  static constexpr const char* PREFIXES[] = {"", "INFO: ", "WARNING: ", "ERROR: ", "DEBUG: "};
+  std::string text = PREFIXES[message.level];
+  text += message.text;
+  if (!text.ends_with('\n')) text += '\n';
+  std::fwrite(text.data(), 1, text.size(), stderr);
+}
+
+constexpr Port_MsgSink START_SINK = {write_to_stderr, nullptr, false};
+
+Port_MsgSink& sink() {
+  static Port_MsgSink current = START_SINK;
+  return current;
+}
+
+std::string formatted(const char* format, va_list arguments) {
+  std::string text;
+  for (const char* f = format; *f != '\0'; ++f) {
+    if (*f != '%' || f[1] == '\0') {
+      text += *f;
+      continue;
+    }
+    switch (*++f) {
+      case 's':
+        if (const char* value = va_arg(arguments, const char*)) text += value;
+        break;
+      case 'z':
+        if (const wchar_t* value = va_arg(arguments, const wchar_t*)) text += to_utf8(value);
+        break;
+      case 'd':
+        text += std::to_string(va_arg(arguments, int));
+        break;
+      case 'c':
+        text += static_cast<char>(va_arg(arguments, int));
+        break;
+      default:
+        text += *f;
+    }
+  }
+  return text;
+}
+
+}  // namespace
+
+Port_MsgSink Port_MsgManData::setSink(const Port_MsgSink& new_sink) {
+  const Port_MsgSink old = sink();
+  sink() = new_sink.function != nullptr ? new_sink : START_SINK;
+  return old;
+}
+
+Port_MsgManData& Port_MsgManData::createObject(const char* program, const char* file, int line,
+                                               const char* revision) {
+  static Port_MsgManData manager;
+  manager.program_ = program;
+  manager.file_ = file;
+  manager.line_ = line;
+  manager.revision_ = revision;
+  return manager;
+}
+
+void Port_MsgManData::issue(Port_MsgLevel level, const char* format, va_list arguments) const {
+  const std::string text = formatted(format, arguments);
+  const Port_MsgSink current = sink();
+  current.function(current.context, {level, program_, file_, line_, revision_, text.c_str()});
+}
+
+void Port_MsgManData::issueStatus(const char* format, ...) {
+  va_list arguments;
+  va_start(arguments, format);
+  issue(PORT_MSG_STATUS, format, arguments);
+  va_end(arguments);
+}
+
+void Port_MsgManData::issueInfo(const char* format, ...) {
+  va_list arguments;
+  va_start(arguments, format);
+  issue(PORT_MSG_INFO, format, arguments);
+  va_end(arguments);
+}
+
+void Port_MsgManData::issueWarning(const char* format, ...) {
+  va_list arguments;
+  va_start(arguments, format);
+  issue(PORT_MSG_WARNING, format, arguments);
+  va_end(arguments);
+}
+
+void Port_MsgManData::issueError(const char* format, ...) {
+  va_list arguments;
+  va_start(arguments, format);
+  issue(PORT_MSG_ERROR, format, arguments);
+  va_end(arguments);
+}
+
+void Port_MsgManData::debugStub(const char* format, ...) {
+  if (!sink().debug) return;
+  va_list arguments;
+  va_start(arguments, format);
+  Port_MsgManData().issue(PORT_MSG_DEBUG, format, arguments);
+  va_end(arguments);
+}

@@ -1,0 +1,249 @@
+#include "host/port_process.h"
+
+#include <fcntl.h>
+#include <poll.h>
+#include <signal.h>
+#include <spawn.h>
+#include <sys/ioctl.h>
+#include <sys/syscall.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <utility>
+
+#include "host/utf8.h"
+
+extern char** environ;
+
+namespace {
+
+/// An open file descriptor, or none (-1).
+class descriptor {
+ public:
+  explicit descriptor(int number = -1) : number_(number) {}
+  descriptor(descriptor&& other) noexcept : number_(std::exchange(other.number_, -1)) {}
+  descriptor& operator=(descriptor&& other) noexcept {
+    std::swap(number_, other.number_);
+    return *this;
+  }
+  ~descriptor() { close(); }
+
+  void close() {
+    if (number_ >= 0) ::close(std::exchange(number_, -1));
+  }
+  int get() const { return number_; }
+
+ private:
+  int number_;
+};
+
+/// A pipe whose ends are above 2, so that none stands where the child's own streams go.
+struct pipe_ends {
+  descriptor read;
+  descriptor write;
+};
+
+/// Returns 0, or the error number.
+int open_pipe(pipe_ends& ends) {
+  int numbers[2];
+  if (::pipe2(numbers, O_CLOEXEC) != 0) return errno;
+  const descriptor low_read(numbers[0]);
+  const descriptor low_write(numbers[1]);
+  ends.read = descriptor(::fcntl(low_read.get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
+  ends.write = descriptor(::fcntl(low_write.get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
+  if (ends.read.get() < 0 || ends.write.get() < 0) return errno;
+  return ::fcntl(ends.read.get(), F_SETFL, O_NONBLOCK) == 0 ? 0 : errno;
+}
+
+/// What a child starts with: the files of its standard streams, no signal blocked, every signal at
+/// its default.
+class child_start {
+ public:
+  /// output: the descriptor for standard output and error, or -1 to share those of this process.
+  explicit child_start(int output) {
+    ::posix_spawn_file_actions_init(&actions_);
+    ::posix_spawn_file_actions_addopen(&actions_, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
+    if (output >= 0) {
+      ::posix_spawn_file_actions_adddup2(&actions_, output, STDOUT_FILENO);
+      ::posix_spawn_file_actions_adddup2(&actions_, output, STDERR_FILENO);
+    }
+    ::posix_spawnattr_init(&attributes_);
+    ::posix_spawnattr_setflags(&attributes_, POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF);
+    sigset_t signals;
+    ::sigemptyset(&signals);
+    ::posix_spawnattr_setsigmask(&attributes_, &signals);
+    ::sigfillset(&signals);
+    ::posix_spawnattr_setsigdefault(&attributes_, &signals);
+  }
+  child_start(const child_start&) = delete;
+  child_start& operator=(const child_start&) = delete;
+  ~child_start() {
+    ::posix_spawn_file_actions_destroy(&actions_);
+    ::posix_spawnattr_destroy(&attributes_);
+  }
+
+  /// Returns 0, or the error number.
+  int spawn(std::vector<std::string>& words, pid_t& child) const {
+    std::vector<char*> arguments;
+    for (std::string& word : words) arguments.push_back(word.data());
+    arguments.push_back(nullptr);
+    // posix_spawn neither copies the memory of this process nor its page tables.
+    return ::posix_spawnp(&child, arguments[0], &actions_, &attributes_, arguments.data(), environ);
+  }
+
+ private:
+  posix_spawn_file_actions_t actions_;
+  posix_spawnattr_t attributes_;
+};
+
+/// Cuts what a child writes into lines.
+class line_cutter {
+ public:
+  explicit line_cutter(Port_Process& process) : process_(process) {}
+
+  void add(std::string_view text) {
+    while (!text.empty()) {
+      const std::size_t stop = text.find('\n');
+      const std::size_t piece = stop == text.npos ? text.size() : stop + 1;
+      line_ += text.substr(0, piece);
+      text.remove_prefix(piece);
+      if (stop != text.npos || line_.size() >= LONGEST) flush();
+    }
+  }
+  void flush() {
+    if (line_.empty()) return;
+    for (std::size_t at = line_.find('\0'); at != line_.npos; at = line_.find('\0', at)) {
+      line_.replace(at, 1, "\u2400");
+    }
+    process_.Output(line_.c_str());
+    line_.clear();
+  }
+
+ private:
+  static constexpr std::size_t LONGEST = 65536;
+
+  Port_Process& process_;
+  std::string line_;
+};
+
+/// Reads at most limit bytes from the pipe, once. Returns how many; 0 at the end of the output,
+/// -1 on failure.
+ssize_t read_once(int pipe, std::size_t limit, line_cutter& lines) {
+  char block[65536];
+  const ssize_t length = ::read(pipe, block, std::min(limit, sizeof block));
+  if (length > 0) lines.add({block, static_cast<std::size_t>(length)});
+  return length;
+}
+
+/// Reads what is in the pipe at this moment, and no more: its writer may never stop.
+void read_rest(int pipe, line_cutter& lines) {
+  int rest = 0;
+  ::ioctl(pipe, FIONREAD, &rest);
+  while (rest > 0) {
+    const ssize_t length = read_once(pipe, static_cast<std::size_t>(rest), lines);
+    if (length == 0 || (length < 0 && errno != EINTR)) return;
+    rest -= static_cast<int>(std::max<ssize_t>(length, 0));
+  }
+}
+
+bool has_ended(pid_t child) {
+  siginfo_t information = {};
+  return ::waitid(P_PID, static_cast<id_t>(child), &information, WEXITED | WNOWAIT | WNOHANG) !=
+             0 ||
+         information.si_pid != 0;
+}
+
+/// Hands on what the child writes until it closes its output or ends, whichever comes first. Some
+/// other process may hold the pipe longer: what is in the pipe when the child has ended is read,
+/// and no more is waited for.
+void pass_output(pid_t child, int pipe, Port_Process& process) {
+  line_cutter lines(process);
+  // A descriptor that becomes readable when the child ends. A kernel without it has to be asked
+  // from time to time.
+  const descriptor end_of_child(static_cast<int>(::syscall(SYS_pidfd_open, child, 0)));
+  const int wait = end_of_child.get() < 0 ? 50 : -1;
+  pollfd events[] = {{pipe, POLLIN, 0}, {end_of_child.get(), POLLIN, 0}};
+  for (;;) {
+    const int ready = ::poll(events, 2, wait);
+    if (ready < 0 && errno != EINTR) break;
+    if ((ready == 0 || (ready > 0 && events[1].revents != 0)) && has_ended(child)) {
+      read_rest(pipe, lines);
+      break;
+    }
+    if (ready <= 0 || events[0].revents == 0) continue;
+    const ssize_t length = read_once(pipe, SIZE_MAX, lines);
+    if (length == 0 || (length < 0 && errno != EAGAIN && errno != EINTR)) break;
+  }
+  lines.flush();
+}
+
+/// Waits for the child. Returns 0 and sets its exit code, or returns the error number.
+int wait_for(pid_t child, int& exit_code) {
+  int status = 0;
+  while (::waitpid(child, &status, 0) < 0) {
+    if (errno != EINTR) return errno;
+  }
+  exit_code = WIFSIGNALED(status) ? 128 + WTERMSIG(status) : WEXITSTATUS(status);
+  return 0;
+}
+
+}  // namespace
+
+bool Port_Process::Split(const std::string& command, std::vector<std::string>& words) {
+  words.clear();
+  bool in_word = false;
+  for (std::size_t i = 0; i < command.size(); ++i) {
+    const char c = command[i];
+    if (c == ' ' || c == '\t') {
+      in_word = false;
+      continue;
+    }
+    const bool quote = c == '"' || (c == '\'' && !in_word);
+    if (!in_word) words.emplace_back();
+    in_word = true;
+    if (!quote) {
+      words.back() += c;
+      continue;
+    }
+    const std::size_t partner = command.find(c, i + 1);
+    if (partner == command.npos) return false;
+    words.back().append(command, i + 1, partner - i - 1);
+    i = partner;
+  }
+  return true;
+}
+
+Port_Process::PROCESS_STATUS Port_Process::fail(const std::string& program,
+                                                const std::string& reason) {
+  error_ = from_utf8(program) + L": " + from_utf8(reason);
+  return PROCESS_FAILED;
+}
+
+Port_Process::PROCESS_STATUS Port_Process::Run(const char* command) {
+  std::vector<std::string> words;
+  if (!Split(command, words)) return fail(command, "a quote is without its partner");
+  // The program's name ends at the first blank: one that is missing is not made up for by the
+  // argument that follows.
+  if (words.empty() || words[0].empty() || command[0] == ' ' || command[0] == '\t') {
+    return fail("\"\"", "the name of the program is empty");
+  }
+
+  pipe_ends ends;
+  if (mode_ == 2) {
+    if (const int error = open_pipe(ends)) return fail(words[0], std::strerror(error));
+  }
+  pid_t child = 0;
+  if (const int error = child_start(ends.write.get()).spawn(words, child)) {
+    return fail(words[0], std::strerror(error));
+  }
+  ends.write.close();
+  if (mode_ == 2) pass_output(child, ends.read.get(), *this);
+  if (const int error = wait_for(child, exit_code_)) {
+    return fail(words[0],
+                std::string("its exit code could not be learnt: ") + std::strerror(error));
+  }
+  return PROCESS_ENDED;
+}

@@ -1,0 +1,55 @@
+// Child processes.
+#ifndef KESTREL_HOST_PORT_PROCESS_H
+#define KESTREL_HOST_PORT_PROCESS_H
+
+#include <string>
+#include <vector>
+
+/// Runs a program and waits for it.
+///
+/// No shell is involved. The command line is split at blanks (space and tab). A pair of double
+/// quotes groups characters and is dropped; so does a single quote that begins a word, up to the
+/// next single quote. Elsewhere a single quote is a character like any other, and nothing else
+/// has a meaning. The program is the text before the first blank; one without "/" is looked for in
+/// the directories of PATH.
+class Port_Process {
+ public:
+  /// What Run returns.
+  enum PROCESS_STATUS {
+    PROCESS_ENDED = 0,   ///< the program was started and has ended
+    PROCESS_FAILED = 1,  ///< it could not be started, or its exit code could not be learnt
+  };
+
+  /// mode 2: what the program writes to its standard output and error goes to Output, line by
+  /// line. mode 0: the program writes to where this process does.
+  explicit Port_Process(int mode) : mode_(mode) {}
+  Port_Process(const Port_Process&) = delete;
+  Port_Process& operator=(const Port_Process&) = delete;
+
+  /// Gets each line that the program writes, in order, with its line end if it has one. A line
+  /// of more than 64 KiB comes in pieces; a zero byte comes as the character U+2400.
+  virtual void Output(const char* text) = 0;
+  virtual ~Port_Process() = default;
+
+  /// Starts the command line in the current directory, with the environment of the process and
+  /// standard input from /dev/null, and returns when the program has ended, even if something
+  /// that it left behind still holds its output open.
+  PROCESS_STATUS Run(const char* command);
+  /// The exit code of the program that Run waited for; 128 + N when signal N ended it.
+  int GetChildRetcode() const { return exit_code_; }
+  /// Why Run failed. The text belongs to this object.
+  wchar_t* GetProcessErrmsg() const { return const_cast<wchar_t*>(error_.c_str()); }
+
+  /// Splits a command line into the program and its arguments. False when a quote is without its
+  /// partner.
+  static bool Split(const std::string& command, std::vector<std::string>& words);
+
+ private:
+  PROCESS_STATUS fail(const std::string& program, const std::string& reason);
+
+  int mode_;
+  int exit_code_ = 0;
+  std::wstring error_;
+};
+
+#endif

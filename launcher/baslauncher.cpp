@@ -1,0 +1,668 @@
+#include "launcher/baslauncher.h"
+
+#include <exception>
+#include <iterator>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "host/pm_pic.h"
+#include "host/port_env.h"
+#include "host/port_init.h"
+#include "host/port_msgman.h"
+#include "host/port_string.h"
+#include "launcher/rule_index.h"
+#include "optparse/baslaoptparse.h"
+#include "rules/baslarules.h"
+
+namespace {
+
+const Port::FileInit file_init;
+const Port::PathListInit path_list_init;
+const CitP::InstanceTableInit instance_table_init;
+const CitP::FactoryInit factory_init;
+const Port_MsgManInit message_manager_init;
+
+char revision[] = "$Revision: 1.13 $";
+
+Port_MsgManData& message(int line = __builtin_LINE()) {
+  return Port_MsgManData::createObject("Kestrel", "launcher/baslauncher.cpp", line, revision);
+}
+
+}  // namespace
+
+void La_Port_Process::Output(const char* text) {
+  message().issueStatus("%s", text);
+}
+
+// ---- The launcher object ----
+
+LA_LAUNCHER::LA_LAUNCHER(const char* part_name, const char** searchpaths, short num_searchpaths,
+                         const char** libraries, short num_libraries, const char* output_dir,
+                         const char* user_rules_file, unsigned char force,
+                         unsigned char ignore_timestamps, unsigned char ignore_locs,
+                         unsigned char add_pads, unsigned char quiet, unsigned char aul)
+    : detail(Port_Env::GetEnv("LAUNCHER_DETAIL") != nullptr),
+      part_name(part_name),
+      output_dir(new LA_DIR(output_dir)),
+      num_searchpaths(0),
+      num_libraries(num_libraries),
+      force(force),
+      ignore_timestamps(ignore_timestamps),
+      ignore_locs(ignore_locs ? "-r" : nullptr),
+      add_pads(add_pads ? "-a" : nullptr),
+      quiet(quiet ? "-quiet" : nullptr),
+      aul(aul ? "-aul" : nullptr) {
+  if (searchpaths != nullptr) add_searchpaths(searchpaths, num_searchpaths);
+  if (libraries != nullptr) {
+    this->libraries.reset(new la_text[static_cast<std::size_t>(num_libraries)]);
+    for (short i = 0; i < num_libraries; ++i) this->libraries[i] = libraries[i];
+  }
+  rules = std::make_unique<LA_RULE_SET>(part_name, user_rules_file);
+  index = std::make_unique<la_rule_index>(rules->rules);
+  ok = rules->is_valid;
+}
+
+LA_LAUNCHER::~LA_LAUNCHER() = default;
+
+void LA_LAUNCHER::add_searchpaths(const char** new_paths, short num_new_paths) {
+  const int total = num_searchpaths + num_new_paths;
+  std::unique_ptr<std::unique_ptr<LA_DIR>[]> paths(
+      new std::unique_ptr<LA_DIR>[static_cast<std::size_t>(total)]);
+  std::move(searchpaths.get(), searchpaths.get() + num_searchpaths, paths.get());
+  for (short i = 0; i < num_new_paths; ++i) {
+    paths[num_searchpaths + i] = std::make_unique<LA_DIR>(new_paths[i]);
+  }
+  searchpaths = std::move(paths);
+  num_searchpaths = static_cast<short>(total);
+}
+
+// ---- Netlist lookup ----
+
+short LA_LAUNCHER::find(const char* name, char* source_path, char* netlist_path,
+                        unsigned char top) {
+  source_path[0] = '\0';
+  netlist_path[0] = '\0';
+  try {
+    if (Port_Env::GetEnv("LA_DISABLE") != nullptr) return find_disabled(name, netlist_path);
+    return find_enabled(name, source_path, netlist_path, top);
+  } catch (const std::exception& failure) {
+    message().issueError("Launcher: Could not resolve %s: %s\n", name, failure.what());
+    ++errors;
+    source_path[0] = '\0';
+    netlist_path[0] = '\0';
+    return LA_FAILED;
+  }
+}
+
+/// Looks for the name in lower case, without rules and messages.
+short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) const {
+  char lower_name[LA_MAX_PATH];
+  if (UT_STR::Copy(lower_name, name) == nullptr) return LA_NOT_FOUND;
+  UT_STR::Lower(lower_name);
+  // The names are kept here: there may be more of them than the ring of results has slots.
+  std::vector<la_text> names;
+  std::vector<const char*> dirs;
+  for (short i = 0; i < num_searchpaths; ++i) names.emplace_back(searchpaths[i]->get_dir());
+  for (const la_text& dir : names) dirs.push_back(dir);
+  const char* found = Port::File::find(lower_name, dirs.data(), num_searchpaths, netlist_path);
+  return found != nullptr ? LA_FOUND : LA_NOT_FOUND;
+}
+
+short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
+                                unsigned char top) {
+  LA_FULLFILE given(name);
+  bool named_kbc = false;
+  if (given.match_ext("kbo")) {
+    given.set_ext(nullptr);
+  } else {
+    named_kbc = given.match_ext("kbc");
+  }
+  if (!is_usable(given, name)) {
+    ++errors;
+    return LA_FAILED;
+  }
+
+  const LA_FILE target(".kbo");
+  LA_FULLFILE source;
+  DARRAY_LA_RULE_CONST_PTR chain(3);
+  find_named(given);
+  std::vector<unsigned char> visited(static_cast<std::size_t>(rules->rules.count));
+  short result = plan_chain(given, target, visited.data(), source, chain);
+  if (result == LA_FOUND) {
+    result = build_chain(source, chain, top, netlist_path);
+  } else if (result == LA_NOT_FOUND) {
+    result = find_native(given, named_kbc, source, netlist_path);
+  }
+  if (result == LA_FOUND) UT_STR::Copy(source_path, source.get_fullfile());
+  return result;
+}
+
+/// Whether a netlist can be looked for by this name; if not, says why.
+bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
+  const bool fits = UT_STR::Len(name) < LA_MAX_PATH;
+  if (fits && given.get_name() == nullptr) {
+    message().issueError("No base name given in netlist specification \"%s\".\n", name);
+    return false;
+  }
+  if (fits && given.get_fullfile() != nullptr) return true;
+  if (fits && LA_DIR(nullptr).get_dir() == nullptr) {
+    message().issueError(
+        "Launcher: The current directory is gone, or too long for netlist \"%s\".\n", name);
+  } else {
+    message().issueError(
+        "Launcher: The full name of netlist \"%s\" is longer than %d characters.\n", name,
+        LA_MAX_PATH - 1);
+  }
+  return false;
+}
+
+/// Looks for the very file that the user named with an extension.
+void LA_LAUNCHER::find_named(const LA_FULLFILE& given) {
+  named_found = 0;
+  named_file.set_file();
+  if (given.get_ext() == nullptr) return;
+  named_found = find_file(given, named_file);
+  if (named_found) return;
+  message().issueWarning(
+      "Launcher: Could not find file %s with extension %s in the search path. Ignoring "
+      "extension.\n",
+      given.get_fullroot(), given.get_ext());
+  ++warnings;
+}
+
+/// Looks for a file that needs no rule: .kbo, then .kbc; only .kbc when the user asked for that.
+short LA_LAUNCHER::find_native(const LA_FULLFILE& given, bool named_kbc, LA_FULLFILE& source,
+                               char* netlist_path) {
+  LA_FULLFILE candidate(given);
+  if (!named_kbc) candidate.set_ext("kbo");
+  bool is_kbo = !named_kbc;
+  if (!find_file(candidate, source)) {
+    candidate.set_ext("kbc");
+    is_kbo = false;
+    if (!find_file(candidate, source)) return LA_NOT_FOUND;
+  }
+  if (is_kbo) {
+    message().issueStatus("Launcher: NOT compiling %s because its source was not found\n",
+                          candidate.get_tail());
+  }
+  UT_STR::Copy(netlist_path, source.get_fullfile());
+  return LA_FOUND;
+}
+
+// ---- Search-path resolution ----
+
+/// Looks where the name says, then in the search directories.
+bool LA_LAUNCHER::find_file(const LA_FULLFILE& given, LA_FULLFILE& found) {
+  if (!given.exists()) return find_in_searchpaths(given, found);
+  found = given;
+  return true;
+}
+
+/// Looks in the search directories. All of them are visited, so that the report on files passed
+/// over is complete. found is written only when there is one.
+unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULLFILE& found) {
+  const la_text file(given.get_file());
+  bool found_any = false;
+  Port::StringBase<char> first;
+  Port::StringBase<char> others;
+  for (short i = 0; i < num_searchpaths; ++i) {
+    const LA_FULLFILE candidate(*searchpaths[i], file);
+    if (!candidate.exists()) continue;
+    const Port::StringBase<char> name(candidate.get_fullfile());
+    if (!found_any) {
+      found = candidate;
+      first = name;
+      found_any = true;
+    } else if (!(name == first) && others.GetIndexOfString(name, Port::StringBase<char>::EXACT) ==
+                                       Port::StringBase<char>::NOT_FOUND) {
+      others += "\t";
+      others += name;
+      others += "\n";
+    }
+  }
+  if (!others.empty()) {
+    message().issueInfo(
+        "Found resolution for '%s' using the search path (-sd switches):\n\t%s\nOther matching "
+        "files found later in the search path will not be used:\n%sEnsure that the correct file "
+        "is used by modifying the search path order.\n",
+        file.get(), first.c_str(), others.c_str());
+  }
+  return found_any;
+}
+
+// ---- Rule chains ----
+
+/// Finds the rules that lead from a file that exists to one of the wanted extension. For each
+/// rule, in the order of the set, a chain that produces its input is preferred to the input itself.
+///
+/// A file of an extension that could not be had once is not tried again. That changes nothing: the
+/// attempt has gone through every rule from which the extension can be reached, and met none of
+/// the rules on its path, or it would have ended in a loop report. So none of those rules leads to
+/// it, from wherever it is wanted next, and the outcome is again that there is no such file.
+short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
+                              unsigned char* visited, LA_FULLFILE& source,
+                              DARRAY_LA_RULE_CONST_PTR& chain) {
+  /// The producers of one extension, and which of them is being tried.
+  struct level {
+    const std::vector<int>* producers;
+    std::size_t tried;
+
+    int rule() const { return (*producers)[tried]; }
+  };
+  const auto producers_of = [this](int extension) { return &index->producers(extension); };
+  std::vector<level> path = {{producers_of(index->extension(wanted.get_ext())), 0}};
+  std::vector<bool> failed(index->num_extensions());
+
+  while (path.back().tried < path.back().producers->size() || path.size() > 1) {
+    if (path.back().tried == path.back().producers->size()) {
+      // No rule produces the input of the rule one level up: perhaps it is there.
+      path.pop_back();
+      const int needing = path.back().rule();
+      visited[needing] = 0;
+      if (find_input(given, *rules->rules.elements[needing], source)) {
+        for (auto used = path.rbegin(); used != path.rend(); ++used) {
+          visited[used->rule()] = 0;
+          chain.append(rules->rules.elements[used->rule()]);
+        }
+        return LA_FOUND;
+      }
+      failed[static_cast<std::size_t>(index->needed(needing))] = true;
+      ++path.back().tried;
+      continue;
+    }
+    const int i = path.back().rule();
+    const LA_RULE& rule = *rules->rules.elements[i];
+    if (visited[i]) {
+      report_loop(visited);
+      for (const level& used : path) visited[used.rule()] = 0;
+      return LA_FAILED;
+    }
+    const char* only_name = rule.netlist_file->get_name();
+    if (failed[static_cast<std::size_t>(index->needed(i))] ||
+        (only_name != nullptr && !given.match_name(only_name))) {
+      ++path.back().tried;
+      continue;
+    }
+    visited[i] = 1;
+    path.push_back({producers_of(index->needed(i)), 0});
+  }
+  return LA_NOT_FOUND;
+}
+
+/// Looks for the file that a rule reads. Where the user named a file, it is that or none.
+bool LA_LAUNCHER::find_input(const LA_FULLFILE& given, const LA_RULE& rule, LA_FULLFILE& source) {
+  const char* ext = rule.netlist_file->get_ext();
+  if (named_found) {
+    if (!named_file.match_ext(ext)) return false;
+    source = named_file;
+    return true;
+  }
+  LA_FULLFILE candidate(given);
+  candidate.set_ext(ext);
+  return find_file(candidate, source);
+}
+
+void LA_LAUNCHER::report_loop(const unsigned char* visited) {
+  message().issueError("The following rules define a loop:\n");
+  for (int i = 0; i < rules->rules.count; ++i) {
+    if (visited[i]) rules->rules.elements[i]->dump(false);
+  }
+  ++errors;
+}
+
+// ---- Build decision and step loop ----
+
+namespace {
+
+enum build_decision : short {
+  LA_BUILD_UNSUPPORTED = -3,
+  LA_BUILD_UP_TO_DATE = -2,
+  LA_BUILD_SKIPPED = -1,
+  LA_BUILD_UNDECIDED = 0,
+  LA_BUILD_FORCED = 1,  // From here on the netlister runs.
+  LA_BUILD_MISSING = 2,
+  LA_BUILD_OUT_OF_DATE = 3,
+  LA_BUILD_AFTER_REBUILD = 4,
+  LA_BUILD_NO_TIMESTAMP = 5,
+};
+
+/// How a decision is reported, with the name of the output. Those of -3 and 0 are not status
+/// messages.
+struct decision_report {
+  build_decision decision;
+  const char* text;
+  bool only_detail;
+};
+constexpr char OUT_OF_DATE[] = "Launcher: %s being compiled because it is out of date\n";
+constexpr char MISSING[] = "Launcher: %s being compiled because it does not exist\n";
+constexpr decision_report REPORTS[] = {
+    {LA_BUILD_UP_TO_DATE, "Launcher: %s is up to date\n", false},
+    {LA_BUILD_SKIPPED, "Launcher: NOT compiling %s because of ignore timestamp flag\n", false},
+    {LA_BUILD_FORCED, "Launcher: %s being compiled because of force flag\n", true},
+    {LA_BUILD_MISSING, MISSING, true},
+    {LA_BUILD_OUT_OF_DATE, OUT_OF_DATE, true},
+    {LA_BUILD_AFTER_REBUILD, OUT_OF_DATE, true},
+    {LA_BUILD_NO_TIMESTAMP,
+     "Launcher: %s being compiled because the time stamps could not be determined\n", true},
+};
+
+Port::FileStatus status_of(const LA_FULLFILE& file) {
+  const char* path = file.get_fullfile();
+  return path != nullptr ? Port::File::status(path) : Port::FileStatus();
+}
+
+/// Compares the rule's dependency files, which lie beside the source, with an output of this time.
+build_decision decide_by_dependency_files(const LA_RULE& rule, const LA_FULLFILE& source,
+                                          __int64 output_time) {
+  if (!rule.has_dependency_files()) return LA_BUILD_UP_TO_DATE;
+  for (const LA_FILE* dependency : *rule.dependency_files) {
+    LA_FULLFILE file(source);
+    if (dependency->get_ext() != nullptr) file.set_ext(dependency->get_ext());
+    if (dependency->get_name() != nullptr) file.set_name(dependency->get_name());
+    const Port::FileStatus status = status_of(file);
+    if (status.exists && status.time > output_time) return LA_BUILD_OUT_OF_DATE;
+  }
+  return LA_BUILD_UP_TO_DATE;
+}
+
+}  // namespace
+
+/// The step of a chain that is being carried out. decision moves on from step to step.
+struct LA_LAUNCHER::build_step {
+  const LA_FULLFILE& source;
+  const LA_RULE* rule;
+  LA_FULLFILE input;
+  LA_FULLFILE output;
+  build_decision decision;
+};
+
+/// The current directory of the process during a chain: back home at its end, whatever happens.
+class LA_LAUNCHER::working_directory {
+ public:
+  working_directory() : home_(nullptr) {}
+  working_directory(const working_directory&) = delete;
+  working_directory& operator=(const working_directory&) = delete;
+  ~working_directory() {
+    if (left_) home_.chdir();
+  }
+
+  /// The directory that was current when the chain started.
+  const LA_DIR& home() const { return home_; }
+  void enter(const LA_DIR& directory) {
+    left_ = true;
+    directory.chdir();
+  }
+
+ private:
+  const LA_DIR home_;
+  bool left_ = false;
+};
+
+short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
+                               unsigned char top, char* netlist_path) {
+  LA_KEYWORD_TABLE options;
+  set_options(options);
+  working_directory directory;
+  build_step step = {source, nullptr, source, LA_FULLFILE(*output_dir, source.get_tail()),
+                     force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED};
+  for (const LA_RULE* rule : chain) {
+    step.rule = rule;
+    if (detail) message().issueStatus("Launcher: Using rule %s\n", rule->rule_name.get());
+    step.output.set_ext(rule->target->get_ext());
+    if (step.output.get_fullfile() == nullptr) {
+      message().issueError(
+          "Launcher: The output of rule %s for %s has no name of at most %d characters in the "
+          "output directory.\n",
+          rule->rule_name.get(), source.get_tail(), LA_MAX_PATH - 1);
+      ++errors;
+      return LA_FAILED;
+    }
+    decide(step);
+    if (!report_decision(step)) return LA_FAILED;
+    if (step.decision > LA_BUILD_UNDECIDED) {
+      if (!run_netlister(step, directory, options, top)) return LA_FAILED;
+      step.decision = LA_BUILD_AFTER_REBUILD;
+    }
+    step.input = step.output;
+  }
+  UT_STR::Copy(netlist_path, step.output.get_fullfile());
+  return LA_FOUND;
+}
+
+/// Sets every keyword but those of a step's files.
+void LA_LAUNCHER::set_options(LA_KEYWORD_TABLE& options) const {
+  std::unique_ptr<PM_PIC> device;
+  if (part_name != nullptr) {
+    device = std::make_unique<PM_PIC>(part_name, 1, PM_PARTNAME_BINDING(0));
+  }
+  options.set_keyword("part", part_name);
+  options.set_keyword("family", device ? device->get_family() : nullptr);
+  options.set_keyword("device", device ? device->get_device() : nullptr);
+  options.set_keyword("pkg", device ? device->get_package() : nullptr);
+  options.set_keyword("speed", device ? device->get_speed() : nullptr);
+  options.set_keyword("ignore_locs", ignore_locs);
+  options.set_keyword("add_pads", add_pads);
+  options.set_keyword("quiet", quiet);
+  options.set_keyword("aul", aul);
+  options.set_keyword("OUTPUT", output_dir->get_dir());
+  if (num_libraries == 0) options.set_keyword("libraries", nullptr);
+  for (short i = 0; i < num_libraries; ++i) options.add_keyword("libraries", libraries[i]);
+}
+
+/// Decides whether the step's netlister must run.
+void LA_LAUNCHER::decide(build_step& step) const {
+  const LA_RULE& rule = *step.rule;
+  if (rule.netlister != nullptr && UT_STR::_Compare(rule.netlister, "NOT_SUPPORTED") == 0) {
+    step.decision = LA_BUILD_UNSUPPORTED;
+    return;
+  }
+  if (step.decision == LA_BUILD_FORCED || step.decision == LA_BUILD_AFTER_REBUILD) return;
+  const Port::FileStatus output = status_of(step.output);
+  if (!output.exists) {
+    step.decision = LA_BUILD_MISSING;
+    return;
+  }
+  if (ignore_timestamps) {
+    step.decision = LA_BUILD_SKIPPED;
+    return;
+  }
+  const Port::FileStatus input = status_of(step.input);
+  if (!input.exists) {
+    step.decision = LA_BUILD_NO_TIMESTAMP;
+  } else if (input.time > output.time) {
+    step.decision = LA_BUILD_OUT_OF_DATE;
+  } else {
+    step.decision = decide_by_dependency_files(rule, step.source, output.time);
+  }
+}
+
+/// Reports the decision. False when it ends the chain.
+bool LA_LAUNCHER::report_decision(const build_step& step) {
+  if (step.decision == LA_BUILD_UNSUPPORTED) {
+    message().issueError(
+        "Launcher: Netlist format of %s is no longer supported, could not create %s\n",
+        step.input.get_fullfile(), step.output.get_tail());
+    ++errors;
+    return false;
+  }
+  for (const decision_report& report : REPORTS) {
+    if (report.decision != step.decision || (report.only_detail && !detail)) continue;
+    const bool gone = step.decision == LA_BUILD_AFTER_REBUILD && !step.output.exists();
+    message().issueStatus(gone ? MISSING : report.text, step.output.get_tail());
+  }
+  return true;
+}
+
+// ---- Netlister run ----
+
+namespace {
+
+/// The names of a step as they stand in a command line.
+struct step_names {
+  std::string infile;
+  std::string outfile;
+  std::string output_dir;
+};
+
+/// Expands the rule's template, which options holds, with these names.
+bool expand(LA_KEYWORD_TABLE& table, const step_names& names, char* options) {
+  table.set_keyword("infile", names.infile.c_str());
+  table.set_keyword("outfile", names.outfile.c_str());
+  table.set_keyword("OUTPUT", names.output_dir.c_str());
+  return table.expand(options, LA_MAX_OPTIONS);
+}
+
+/// A file as an argument: quoted, and not to be taken for an option.
+std::string argument_of(const LA_FULLFILE& file) {
+  const char* path = file.get_external_path();
+  std::string argument(path != nullptr ? path : "");
+  if (argument.starts_with("\"-")) argument.insert(1, "./");
+  return argument;
+}
+
+/// Stand-ins for the names of a step: characters that mean nothing in a command line.
+const step_names PLAIN_NAMES = {"\"\1\"", "\"\2\"", "\3"};
+
+/// Puts the names in the place of their stand-ins.
+std::string with_names(const std::string& word, const step_names& names) {
+  std::string result;
+  for (const char c : word) {
+    switch (c) {
+      case '\1':
+        result.append(names.infile, 1, names.infile.size() - 2);
+        break;
+      case '\2':
+        result.append(names.outfile, 1, names.outfile.size() - 2);
+        break;
+      case '\3':
+        result += names.output_dir;
+        break;
+      default:
+        result += c;
+    }
+  }
+  return result;
+}
+
+/// Whether a command line splits into the words that it would split into if its names were plain
+/// ones. If not, something in a name - a quote, or a blank where the template does not quote it -
+/// would make or change an argument.
+bool names_stay_in_place(const std::string& command, const std::string& plain_command,
+                         const step_names& names) {
+  std::vector<std::string> words;
+  std::vector<std::string> plain_words;
+  if (!Port_Process::Split(plain_command, plain_words)) return true;  // Not for a name's sake.
+  if (!Port_Process::Split(command, words)) return false;
+  for (std::string& word : plain_words) word = with_names(word, names);
+  return words == plain_words;
+}
+
+}  // namespace
+
+/// Runs the step's netlister and judges how it ended. False when the chain ends here.
+bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& directory,
+                                LA_KEYWORD_TABLE& options, unsigned char top) {
+  if (directory.home().get_dir() == nullptr) {
+    message().issueError(
+        "Launcher: The current directory is gone, or too long to return to: %s is not run.\n",
+        step.rule->netlister.get());
+    ++errors;
+    return false;
+  }
+  enter_directory(step, directory);
+  std::string command;
+  if (!make_command(step, options, top, command)) return false;
+  message().issueStatus("Launcher: Executing %s\n", command.c_str());
+  return Port_Env::GetEnv("LA_TEST") != nullptr || execute(*step.rule, command);
+}
+
+/// Goes to the directory that the rule asks for. Where it cannot be entered, the netlister runs
+/// where the process stands.
+void LA_LAUNCHER::enter_directory(const build_step& step, working_directory& directory) const {
+  const LA_RULE& rule = *step.rule;
+  const char* name = nullptr;
+  switch (rule.netlister_dir_flag) {
+    case DIR_UNSET:
+    case DIR_NONE:
+      name = directory.home().get_dir();
+      break;
+    case DIR_SOURCE:
+      name = step.input.get_fullhead();
+      break;
+    case DIR_OUTPUT:
+      name = step.output.get_fullhead();
+      break;
+    default:
+      name = rule.netlister_dir ? rule.netlister_dir->get_dir() : nullptr;
+  }
+  const LA_DIR chosen(name);
+  directory.enter(chosen);
+  if (!detail) return;
+
+  const char* netlister = rule.netlister;
+  message().issueStatus("Launcher: Running %s from %s\n", netlister, chosen.get_dir());
+  message().issueStatus("Launcher: Environment inherited by %s will be:\n", netlister);
+  for (const char* variable : {"MYCORVANE", "CORVANE", "PATH"}) {
+    const char* value = Port_Env::GetEnv(variable);
+    message().issueStatus("Launcher:    %s is %s\n", variable, value != nullptr ? value : "unset");
+  }
+}
+
+/// Makes the command line of the step.
+bool LA_LAUNCHER::make_command(const build_step& step, LA_KEYWORD_TABLE& options, unsigned char top,
+                               std::string& command) {
+  const LA_RULE& rule = *step.rule;
+  const char* options_template = top && rule.netlister_top_options != nullptr
+                                     ? rule.netlister_top_options
+                                     : rule.netlister_options;
+  if (options_template == nullptr) options_template = "";
+  const step_names names = {argument_of(step.input), argument_of(step.output),
+                            output_dir->get_dir()};
+  if (names.infile.empty() || names.outfile.empty()) {
+    message().issueError("Launcher: The name of %s is too long for a command line.\n",
+                         names.infile.empty() ? step.input.get_tail() : step.output.get_tail());
+    ++errors;
+    return false;
+  }
+
+  char expanded[LA_MAX_OPTIONS];
+  const std::string start = std::string(rule.netlister ? rule.netlister.get() : "") + " ";
+  UT_STR::Copy(expanded, options_template, sizeof expanded);
+  if (!expand(options, names, expanded)) {
+    message().issueError("Could not expand option string \"%s\"\n", expanded);
+    errors += 2;
+    return false;
+  }
+  command = start + expanded;
+
+  UT_STR::Copy(expanded, options_template, sizeof expanded);
+  expand(options, PLAIN_NAMES, expanded);
+  if (names_stay_in_place(command, start + expanded, names)) return true;
+  message().issueError(
+      "Launcher: A file or directory name would change the arguments of %s, which is therefore not "
+      "run: %s\n",
+      rule.netlister.get(), command.c_str());
+  ++errors;
+  return false;
+}
+
+/// Runs a command line and judges its exit code by the rule.
+bool LA_LAUNCHER::execute(const LA_RULE& rule, const std::string& command) {
+  La_Port_Process process(2);
+  if (process.Run(command.c_str()) != Port_Process::PROCESS_ENDED) {
+    message().issueError("Failed to launch program %z\n", process.GetProcessErrmsg());
+    ++errors;
+    return false;
+  }
+  const int exit_code = process.GetChildRetcode();
+  if (detail) {
+    message().issueStatus("Launcher: %s exited with an exit code of %d\n", rule.netlister.get(),
+                          exit_code);
+  }
+  if (rule.netlister_result(exit_code) != LA_FATAL) return true;
+  message().issueError("%s exited with errors (return code %d).\n", rule.netlister.get(),
+                       exit_code);
+  ++errors;
+  return false;
+}

@@ -1,0 +1,126 @@
+// The launcher: turns the name of a netlist into the file that the host program is to read.
+#ifndef KESTREL_LAUNCHER_BASLAUNCHER_H
+#define KESTREL_LAUNCHER_BASLAUNCHER_H
+
+#include <memory>
+
+#include "file/baslafile.h"
+#include "host/port_process.h"
+#include "host/ut_darray.h"
+#include "host/ut_str.h"
+
+class LA_KEYWORD_TABLE;
+class LA_RULE;
+class LA_RULE_SET;
+class la_rule_index;
+using DARRAY_LA_RULE_CONST_PTR = UT_TYPED_DARRAY<const LA_RULE*>;
+
+/// What find returns.
+enum : short { LA_FAILED = -1, LA_FOUND = 0, LA_NOT_FOUND = 1 };
+
+/// The longest command-line options that a template may expand to, terminator included.
+constexpr int LA_MAX_OPTIONS = 32768;
+
+/// The child process in which a netlister runs: what it writes is shown as status messages.
+class La_Port_Process : public Port_Process {
+ public:
+  explicit La_Port_Process(int mode) : Port_Process(mode) {}
+  void Output(const char* text) override;
+};
+
+/// One launcher serves any number of find calls, all from one thread. While a netlister runs, the
+/// current directory of the process is the netlister's; no two find calls may run at one time in a
+/// process, of one launcher or of two. No operation throws.
+class LA_LAUNCHER {
+ public:
+  /// Loads the rules; findings are issued as messages. All arguments are copied.
+  ///
+  /// part_name: the device part name, or null. searchpaths: the directories in which sources are
+  /// looked for, in this order, after the current directory; relative names are relative to the
+  /// current directory of this moment; null when num_searchpaths is 0. libraries: values of the
+  /// option keyword "libraries"; null when num_libraries is 0. output_dir: where netlisters write;
+  /// null for the current directory. user_rules_file: null for none; the extension is urf unless
+  /// the name has one. force: run every step, whatever the time stamps say. ignore_timestamps: do
+  /// not run a step whose output exists. The last four give the option keywords of their name the
+  /// values "-r", "-a", "-quiet" and "-aul".
+  LA_LAUNCHER(const char* part_name, const char** searchpaths, short num_searchpaths,
+              const char** libraries, short num_libraries, const char* output_dir,
+              const char* user_rules_file, unsigned char force, unsigned char ignore_timestamps,
+              unsigned char ignore_locs, unsigned char add_pads, unsigned char quiet,
+              unsigned char aul);
+  LA_LAUNCHER(const LA_LAUNCHER&) = delete;
+  LA_LAUNCHER& operator=(const LA_LAUNCHER&) = delete;
+  ~LA_LAUNCHER();
+
+  /// Resolves a netlist name: plans the chain of rules that makes its ".kbo" file, and runs the
+  /// netlisters that are due; where no chain applies, looks for a .kbo or .kbc file of that name.
+  ///
+  /// source_path and netlist_path are buffers of at least LA_MAX_PATH characters; they receive the
+  /// file at the start of the chain and the file to read. top: non-zero for the top-level netlist,
+  /// for which netlisters get their top-level options.
+  ///
+  /// Returns LA_FOUND; LA_NOT_FOUND when no rule and no file fits; LA_FAILED when an error has
+  /// been reported, and errors has grown. In the last two cases both buffers are empty strings.
+  short find(const char* name, char* source_path, char* netlist_path, unsigned char top);
+  /// Appends search directories, to be searched after those that there are.
+  void add_searchpaths(const char** searchpaths, short num_searchpaths);
+
+  /// 1 when the rules were loaded and passed their checks.
+  unsigned char ok = 0;
+
+ private:
+  unsigned char detail = 0;
+
+ public:
+  /// What find has reported since construction. Findings on the rules do not count here.
+  int errors = 0;
+  int warnings = 0;
+
+ private:
+  short find_disabled(const char* name, char* netlist_path) const;
+  short find_enabled(const char* name, char* source_path, char* netlist_path, unsigned char top);
+  bool is_usable(const LA_FULLFILE& given, const char* name);
+  void find_named(const LA_FULLFILE& given);
+  short find_native(const LA_FULLFILE& given, bool named_kbc, LA_FULLFILE& source,
+                    char* netlist_path);
+  bool find_file(const LA_FULLFILE& given, LA_FULLFILE& found);
+  unsigned char find_in_searchpaths(const LA_FULLFILE& given, LA_FULLFILE& found);
+
+  short plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted, unsigned char* visited,
+                   LA_FULLFILE& source, DARRAY_LA_RULE_CONST_PTR& chain);
+  bool find_input(const LA_FULLFILE& given, const LA_RULE& rule, LA_FULLFILE& source);
+  void report_loop(const unsigned char* visited);
+
+  struct build_step;
+  class working_directory;
+  short build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
+                    unsigned char top, char* netlist_path);
+  void set_options(LA_KEYWORD_TABLE& options) const;
+  void decide(build_step& step) const;
+  bool report_decision(const build_step& step);
+  bool run_netlister(const build_step& step, working_directory& directory,
+                     LA_KEYWORD_TABLE& options, unsigned char top);
+  void enter_directory(const build_step& step, working_directory& directory) const;
+  bool make_command(const build_step& step, LA_KEYWORD_TABLE& options, unsigned char top,
+                    std::string& command);
+  bool execute(const LA_RULE& rule, const std::string& command);
+
+  la_text part_name;
+  std::unique_ptr<LA_DIR> output_dir;
+  short num_searchpaths;
+  std::unique_ptr<std::unique_ptr<LA_DIR>[]> searchpaths;
+  short num_libraries;
+  std::unique_ptr<la_text[]> libraries;
+  unsigned char force;
+  unsigned char ignore_timestamps;
+  la_text ignore_locs;
+  la_text add_pads;
+  la_text quiet;
+  la_text aul;
+  unsigned char named_found = 0;
+  LA_FULLFILE named_file;
+  std::unique_ptr<LA_RULE_SET> rules;
+  std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions
+};
+
+#endif

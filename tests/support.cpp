@@ -1,0 +1,149 @@
+#include "support.h"
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <sstream>
+
+namespace fs = std::filesystem;
+
+const char* const KESTREL_LAUNCH = KESTREL_BIN_DIR "/kestrel-launch";
+const char* const TEST_NETLISTER = KESTREL_BIN_DIR "/test-netlister";
+
+namespace {
+
+void record(void* self, const Port_Msg& m) {
+  std::string origin;
+  if (m.file != nullptr) {
+    origin = std::string(m.file) + ":" + std::to_string(m.line) + " " + m.revision;
+    EXPECT_STREQ(m.program, "Kestrel");
+  }
+  static_cast<Messages*>(self)->records.push_back({m.level, origin, m.text});
+}
+
+std::string replace(std::string text, const std::string& from, const std::string& to) {
+  for (std::size_t at = text.find(from); at != text.npos; at = text.find(from, at + to.size())) {
+    text.replace(at, from.size(), to);
+  }
+  return text;
+}
+
+std::string slurp(const std::string& path) {
+  std::ifstream in(path, std::ios::binary);
+  return {std::istreambuf_iterator<char>(in), {}};
+}
+
+}  // namespace
+
+Messages::Messages() : before_(Port_MsgManData::setSink({record, this, true})) {}
+
+std::string Messages::take() {
+  std::string all;
+  for (const Record& r : records) all += std::string(1, "SIWED"[r.level]) + " " + r.text;
+  records.clear();
+  return all;
+}
+
+Variable::Variable(const char* name, const char* value) : name_(name) {
+  if (const char* old = std::getenv(name)) before_ = old;
+  value != nullptr ? ::setenv(name, value, 1) : ::unsetenv(name);
+}
+
+Variable::~Variable() {
+  before_ ? ::setenv(name_.c_str(), before_->c_str(), 1) : ::unsetenv(name_.c_str());
+}
+
+Tree::Tree() : before_(fs::current_path()) {
+  std::string name = fs::temp_directory_path() / "kestrel-XXXXXX";
+  home = fs::canonical(::mkdtemp(name.data()));
+  fs::current_path(home);
+  fs::create_directories(full("root/data"));
+  root_.emplace("CORVANE", full("root").c_str());
+}
+
+Tree::~Tree() {
+  fs::current_path(before_);
+  fs::remove_all(home);
+}
+
+void Tree::make(const std::string& files) {
+  std::istringstream words(files);
+  for (std::string word; words >> word;) {
+    const std::size_t at = std::min(word.find('@'), word.size());
+    const std::string path = word.substr(0, at);
+    if (path.ends_with('/')) {
+      fs::create_directories(full(path));
+      continue;
+    }
+    if (!exists(path)) write(path, path + "\n");
+    const time_t age = at < word.size() ? std::stol(word.substr(at + 1)) : 0;
+    const timespec times[2] = {{1'700'000'000 + age, 0}, {1'700'000'000 + age, 0}};
+    ASSERT_EQ(::utimensat(AT_FDCWD, full(path).c_str(), times, 0), 0) << path;
+  }
+}
+
+void Tree::write(const std::string& path, const std::string& content) {
+  fs::create_directories(fs::path(full(path)).parent_path());
+  std::ofstream(full(path), std::ios::binary) << content;
+}
+
+std::string Tree::read(const std::string& path) const {
+  return slurp(full(path));
+}
+
+bool Tree::exists(const std::string& path) const {
+  return fs::exists(full(path));
+}
+
+void Tree::remove(const std::string& path) const {
+  fs::remove_all(full(path));
+}
+
+std::string Tree::expand(std::string text) const {
+  return replace(std::move(text), "~", home);
+}
+
+std::string Tree::shorten(std::string text) const {
+  return replace(std::move(text), home, "~");
+}
+
+Ran run(const std::vector<std::string>& words, const std::string& input) {
+  std::string base = fs::temp_directory_path() / "kestrel-run-XXXXXX";
+  ::mkdtemp(base.data());
+  std::ofstream(base + "/in", std::ios::binary) << input;
+  const pid_t child = ::fork();
+  if (child == 0) {
+    ::dup2(::open((base + "/in").c_str(), O_RDONLY), 0);
+    ::dup2(::open((base + "/out").c_str(), O_CREAT | O_WRONLY, 0600), 1);
+    ::dup2(::open((base + "/err").c_str(), O_CREAT | O_WRONLY, 0600), 2);
+    std::vector<char*> arguments;
+    for (const std::string& word : words) arguments.push_back(const_cast<char*>(word.c_str()));
+    arguments.push_back(nullptr);
+    ::execvp(arguments[0], arguments.data());
+    ::_exit(127);
+  }
+  int status = 0;
+  ::waitpid(child, &status, 0);
+  Ran ran = {WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status), slurp(base + "/out"),
+             slurp(base + "/err")};
+  fs::remove_all(base);
+  return ran;
+}
+
+int main(int count, char** words) {
+  for (const char* name : {"LAUNCHER_DETAIL", "LA_DISABLE", "LA_TEST", "MYCORVANE", "CORVANE",
+                           "CVN_KESTREL_ALLOW_PLF", "NO_COLOR"}) {
+    ::unsetenv(name);
+  }
+  ::setenv("LC_ALL", "C", 1);
+  ::setenv("TZ", "UTC", 1);
+  ::testing::InitGoogleTest(&count, words);
+  return RUN_ALL_TESTS();
+}
