@@ -16,8 +16,6 @@
 
 #include "host/utf8.h"
 
-extern char** environ;
-
 namespace {
 
 /// An open file descriptor, or none (-1).
@@ -88,6 +86,7 @@ class child_start {
   /// Returns 0, or the error number.
   int spawn(std::vector<std::string>& words, pid_t& child) const {
     std::vector<char*> arguments;
+    arguments.reserve(words.size() + 1);
     for (std::string& word : words) arguments.push_back(word.data());
     arguments.push_back(nullptr);
     // posix_spawn neither copies the memory of this process nor its page tables.

@@ -18,7 +18,7 @@ void UT_DARRAY::clearmem(void* from, int elements) {
 
 void UT_DARRAY::qsort(int first, int last, Compare compare) {
   if (first >= last) return;
-  std::qsort(place(first), static_cast<std::size_t>(last - first + 1),
+  std::qsort(place(first), static_cast<std::size_t>(last) - static_cast<std::size_t>(first) + 1,
              static_cast<std::size_t>(element_size_), compare);
 }
 

@@ -83,7 +83,7 @@ template <class Element>
 class UT_TYPED_DARRAY : public UT_DARRAY {
  public:
   explicit UT_TYPED_DARRAY(int step)
-      : UT_DARRAY(reinterpret_cast<void**>(&elements), sizeof(Element), step, 0) {}
+      : UT_DARRAY(reinterpret_cast<void**>(&elements), sizeof(void*), step, 0) {}
 
   using UT_DARRAY::a_resetnum;
 

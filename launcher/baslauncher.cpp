@@ -1,7 +1,9 @@
 #include "launcher/baslauncher.h"
 
+#include <algorithm>
 #include <exception>
 #include <iterator>
+#include <span>
 #include <string>
 #include <utility>
 #include <vector>
@@ -27,6 +29,12 @@ char revision[] = "$Revision: 1.13 $";
 
 Port_MsgManData& message(int line = __builtin_LINE()) {
   return Port_MsgManData::createObject("Kestrel", "launcher/baslauncher.cpp", line, revision);
+}
+
+/// The elements of an array that is kept with its count.
+template <class Element>
+std::span<Element> counted(const std::unique_ptr<Element[]>& array, short count) {
+  return {array.get(), static_cast<std::size_t>(count)};
 }
 
 }  // namespace
@@ -56,7 +64,7 @@ LA_LAUNCHER::LA_LAUNCHER(const char* part_name, const char** searchpaths, short 
   if (searchpaths != nullptr) add_searchpaths(searchpaths, num_searchpaths);
   if (libraries != nullptr) {
     this->libraries.reset(new la_text[static_cast<std::size_t>(num_libraries)]);
-    for (short i = 0; i < num_libraries; ++i) this->libraries[i] = libraries[i];
+    std::copy(libraries, libraries + num_libraries, this->libraries.get());
   }
   rules = std::make_unique<LA_RULE_SET>(part_name, user_rules_file);
   index = std::make_unique<la_rule_index>(rules->rules);
@@ -70,9 +78,8 @@ void LA_LAUNCHER::add_searchpaths(const char** new_paths, short num_new_paths) {
   std::unique_ptr<std::unique_ptr<LA_DIR>[]> paths(
       new std::unique_ptr<LA_DIR>[static_cast<std::size_t>(total)]);
   std::move(searchpaths.get(), searchpaths.get() + num_searchpaths, paths.get());
-  for (short i = 0; i < num_new_paths; ++i) {
-    paths[num_searchpaths + i] = std::make_unique<LA_DIR>(new_paths[i]);
-  }
+  std::transform(new_paths, new_paths + num_new_paths, paths.get() + num_searchpaths,
+                 [](const char* path) { return std::make_unique<LA_DIR>(path); });
   searchpaths = std::move(paths);
   num_searchpaths = static_cast<short>(total);
 }
@@ -103,8 +110,8 @@ short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) const {
   // The names are kept here: there may be more of them than the ring of results has slots.
   std::vector<la_text> names;
   std::vector<const char*> dirs;
-  for (short i = 0; i < num_searchpaths; ++i) names.emplace_back(searchpaths[i]->get_dir());
-  for (const la_text& dir : names) dirs.push_back(dir);
+  for (const auto& dir : counted(searchpaths, num_searchpaths)) names.emplace_back(dir->get_dir());
+  dirs.assign(names.begin(), names.end());
   const char* found = Port::File::find(lower_name, dirs.data(), num_searchpaths, netlist_path);
   return found != nullptr ? LA_FOUND : LA_NOT_FOUND;
 }
@@ -206,8 +213,8 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULL
   bool found_any = false;
   Port::StringBase<char> first;
   Port::StringBase<char> others;
-  for (short i = 0; i < num_searchpaths; ++i) {
-    const LA_FULLFILE candidate(*searchpaths[i], file);
+  for (const auto& dir : counted(searchpaths, num_searchpaths)) {
+    const LA_FULLFILE candidate(*dir, file);
     if (!candidate.exists()) continue;
     const Port::StringBase<char> name(candidate.get_fullfile());
     if (!found_any) {
@@ -331,20 +338,20 @@ enum build_decision : short {
 /// messages.
 struct decision_report {
   build_decision decision;
-  const char* text;
   bool only_detail;
+  const char* text;
 };
 constexpr char OUT_OF_DATE[] = "Launcher: %s being compiled because it is out of date\n";
 constexpr char MISSING[] = "Launcher: %s being compiled because it does not exist\n";
 constexpr decision_report REPORTS[] = {
-    {LA_BUILD_UP_TO_DATE, "Launcher: %s is up to date\n", false},
-    {LA_BUILD_SKIPPED, "Launcher: NOT compiling %s because of ignore timestamp flag\n", false},
-    {LA_BUILD_FORCED, "Launcher: %s being compiled because of force flag\n", true},
-    {LA_BUILD_MISSING, MISSING, true},
-    {LA_BUILD_OUT_OF_DATE, OUT_OF_DATE, true},
-    {LA_BUILD_AFTER_REBUILD, OUT_OF_DATE, true},
-    {LA_BUILD_NO_TIMESTAMP,
-     "Launcher: %s being compiled because the time stamps could not be determined\n", true},
+    {LA_BUILD_UP_TO_DATE, false, "Launcher: %s is up to date\n"},
+    {LA_BUILD_SKIPPED, false, "Launcher: NOT compiling %s because of ignore timestamp flag\n"},
+    {LA_BUILD_FORCED, true, "Launcher: %s being compiled because of force flag\n"},
+    {LA_BUILD_MISSING, true, MISSING},
+    {LA_BUILD_OUT_OF_DATE, true, OUT_OF_DATE},
+    {LA_BUILD_AFTER_REBUILD, true, OUT_OF_DATE},
+    {LA_BUILD_NO_TIMESTAMP, true,
+     "Launcher: %s being compiled because the time stamps could not be determined\n"},
 };
 
 Port::FileStatus status_of(const LA_FULLFILE& file) {
@@ -447,7 +454,9 @@ void LA_LAUNCHER::set_options(LA_KEYWORD_TABLE& options) const {
   options.set_keyword("aul", aul);
   options.set_keyword("OUTPUT", output_dir->get_dir());
   if (num_libraries == 0) options.set_keyword("libraries", nullptr);
-  for (short i = 0; i < num_libraries; ++i) options.add_keyword("libraries", libraries[i]);
+  for (const la_text& library : counted(libraries, num_libraries)) {
+    options.add_keyword("libraries", library);
+  }
 }
 
 /// Decides whether the step's netlister must run.

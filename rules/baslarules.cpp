@@ -356,8 +356,8 @@ struct rule_batch {
   }
 
   void add(std::unique_ptr<LA_RULE> rule) {
-    rules.append(rule.get());
-    rule.release();
+    rules.append(nullptr);
+    rules.elements[rules.count - 1] = rule.release();
   }
   void move_to(DARRAY_LA_RULE_PTR& set) {
     for (LA_RULE* rule : rules) set.append(rule);
@@ -560,7 +560,7 @@ std::string system_rules_file(PM_PIC& device) {
   const PM_DEVKEY key("larules.acd", &device, 0, 1, 1);
   if (Port_Env::GetEnv("CVN_KESTREL_ALLOW_PLF") != nullptr) {
     for (const Port::StringBase<char>& root : Port::CvnenvPath::GetInstance()) {
-      const std::string path = std::string(root.c_str()) + "/data/" + "laplfrules.acd";
+      std::string path = std::string(root.c_str()) + "/data/" + "laplfrules.acd";
       if (!Port::File::exist(path.c_str())) continue;
       Port_MsgManData::debugStub(
           "Launcher: CVN_KESTREL_ALLOW_PLF is set. Using rules file for plf2kdb.\n");

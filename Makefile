@@ -1,0 +1,55 @@
+# make demo    set up, build, resolve the examples
+# make test    set up, build, pass all tests
+BUILD ?= build
+JOBS ?= $(shell nproc)
+
+BUILD_PACKAGES = g++ cmake make
+TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db
+DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
+LINT_PACKAGES = clang-format-14 clang-tidy-14
+
+.PHONY: all build demo test sanitize lint clean help
+
+all: build
+
+build:
+	@tools/setup $(BUILD_PACKAGES)
+	@cmake -S . -B $(BUILD) -DCMAKE_BUILD_TYPE=Release -DKESTREL_TESTS=OFF >/dev/null
+	@cmake --build $(BUILD) --parallel $(JOBS)
+	@echo "Built $(BUILD)/bin/kestrel-launch"
+
+demo:
+	@tools/setup $(DEMO_PACKAGES)
+	@$(MAKE) --no-print-directory build >/dev/null
+	@tools/demo $(BUILD)
+
+test:
+	@tools/setup $(TEST_PACKAGES)
+	@cmake -S . -B $(BUILD) -DCMAKE_BUILD_TYPE=Release -DKESTREL_TESTS=ON >/dev/null
+	@cmake --build $(BUILD) --parallel $(JOBS)
+	@cd $(BUILD) && ctest --output-on-failure --parallel $(JOBS)
+	@echo "All tests passed, of $(BUILD)/bin/kestrel-launch and its library."
+
+# The tests again, under AddressSanitizer (with its leak check) and UndefinedBehaviorSanitizer.
+sanitize:
+	@tools/setup $(TEST_PACKAGES)
+	@cmake -S . -B $(BUILD)-sanitize -DCMAKE_BUILD_TYPE=Debug -DKESTREL_SANITIZE=ON >/dev/null
+	@cmake --build $(BUILD)-sanitize --parallel $(JOBS)
+	@cd $(BUILD)-sanitize && ctest --output-on-failure --parallel $(JOBS)
+	@echo "All tests passed under AddressSanitizer and UndefinedBehaviorSanitizer."
+
+# The formatter and the linter, which must have nothing to say.
+lint:
+	@tools/setup $(LINT_PACKAGES) $(TEST_PACKAGES)
+	@tools/lint $(BUILD)
+
+clean:
+	@rm -rf $(BUILD) $(BUILD)-*
+
+help:
+	@echo "make           build the library and the command"
+	@echo "make demo      set up, build, and resolve the examples"
+	@echo "make test      set up, build, and pass all tests"
+	@echo "make sanitize  pass all tests under the sanitizers"
+	@echo "make lint      check format and code with clang's tools"
+	@echo "make clean     remove what was built"
