@@ -29,16 +29,11 @@ constexpr appearance appearance_of(Port_MsgLevel level) {
   }
 }
 
-bool wants_colour() {
-  const char* no_colour = std::getenv("NO_COLOR");
-  return no_colour == nullptr || *no_colour == '\0';
-}
-
 }  // namespace
 
 console::console(bool debug)
     : is_terminal_(::isatty(STDERR_FILENO) != 0),
-      colour_(is_terminal_ && wants_colour()),
+      colour_(is_terminal_ && std::getenv("NO_COLOR") == nullptr),
       before_(Port_MsgManData::setSink({show, this, debug})) {}
 
 console::~console() {

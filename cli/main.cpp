@@ -53,6 +53,15 @@ std::string check_directories(const settings& set) {
   return {};
 }
 
+/// What is to be done before names can be resolved. Returns an empty text, or what is wrong.
+std::string complete(settings& set) {
+  std::string wrong = check_directories(set);
+  for (const char* file : set.names_files) {
+    if (wrong.empty()) wrong = read_names(file, set.names);
+  }
+  return wrong;
+}
+
 void print_totals(bool ok, int errors, int warnings) {
   std::printf("{\"ok\":%s,\"errors\":%d,\"warnings\":%d}\n", ok ? "true" : "false", errors,
               warnings);
@@ -67,6 +76,8 @@ void print_result(const settings& set, const std::string& name, short result, co
   } else if (result == LA_FOUND) {
     std::printf("%s\n", netlist);
   }
+  // Whoever reads the results need not wait for the last of them.
+  std::fflush(stdout);
 }
 
 int resolve(settings& set, const console& shown) {
@@ -106,7 +117,8 @@ int show_rules(const settings& set) {
   if (rules.is_valid && set.what == task::GRAPH) std::fputs(graph_of(rules.rules).c_str(), stdout);
   if (set.what == task::CHECK) {
     if (set.json) print_totals(rules.is_valid, 0, 0);
-    if (!set.json && rules.is_valid) std::printf("%d rules, all good\n", rules.rules.count);
+    if (!set.json && rules.is_valid)
+      std::printf("Rules checked: %d, all good\n", rules.rules.count);
   }
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
@@ -133,10 +145,7 @@ int run(settings& set) {
 int run_command_line(int count, const char* const* words) {
   settings set;
   std::string wrong = read_command_line(count, words, set);
-  if (wrong.empty()) wrong = check_directories(set);
-  for (const char* file : set.names_files) {
-    if (wrong.empty() && set.what == task::RESOLVE) wrong = read_names(file, set.names);
-  }
+  if (wrong.empty() && set.what == task::RESOLVE) wrong = complete(set);
   if (!wrong.empty()) {
     complain(wrong);
     std::fputs("Try 'kestrel-launch --help'.\n", stderr);

@@ -51,15 +51,17 @@ bool take_entry(std::string& rest, const StaticAcdRead& table, const char* devic
 }  // namespace
 
 PM_PIC::PM_PIC(const char* part_name, unsigned char /*unused*/, PM_PARTNAME_BINDING /*binding*/) {
+  bool readable = true;
   for (const Port::StringBase<char>& root : Port::CvnenvPath::GetInstance()) {
     const std::string path = std::string(root.c_str()) + "/data/devices.acd";
     const StaticAcdRead table(path.c_str(), nullptr, nullptr, 1, 0, 1);
+    readable = readable && table.valid();
     const std::string device = device_of(table, part_name);
     if (device.empty()) continue;
     std::string rest = part_name + device.size();
     device_ = device.c_str();
     family_ = entry(table, device_, FAMILY_FIELD, 0);
-    valid_ = take_entry(rest, table, device_, PACKAGE_FIELD, package_) &&
+    valid_ = readable && take_entry(rest, table, device_, PACKAGE_FIELD, package_) &&
              take_entry(rest, table, device_, SPEED_FIELD, speed_) && rest.empty();
     return;
   }

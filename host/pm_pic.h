@@ -20,7 +20,8 @@ class PM_PIC {
   virtual ~PM_PIC() = default;
 
   /// 1 when the device is known and has the package and the speed grade that the part name
-  /// names, else 0. The arguments are not used.
+  /// names, else 0; also 0 when a device table on the way to it is damaged. The arguments are not
+  /// used.
   virtual unsigned char is_valid(unsigned char, int);
 
   /// The fields in the spelling of the device table; null for what the part name does not name or

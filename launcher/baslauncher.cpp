@@ -1,8 +1,10 @@
 #include "launcher/baslauncher.h"
 
 #include <algorithm>
+#include <climits>
 #include <exception>
 #include <iterator>
+#include <optional>
 #include <span>
 #include <string>
 #include <utility>
@@ -13,8 +15,8 @@
 #include "host/port_init.h"
 #include "host/port_msgman.h"
 #include "host/port_string.h"
+#include "launcher/command_options.h"
 #include "launcher/rule_index.h"
-#include "optparse/baslaoptparse.h"
 #include "rules/baslarules.h"
 
 namespace {
@@ -75,6 +77,10 @@ LA_LAUNCHER::~LA_LAUNCHER() = default;
 
 void LA_LAUNCHER::add_searchpaths(const char** new_paths, short num_new_paths) {
   const int total = num_searchpaths + num_new_paths;
+  if (total > SHRT_MAX) {
+    message().issueError("Launcher: There can be at most %d search directories.\n", SHRT_MAX);
+    return;
+  }
   std::unique_ptr<std::unique_ptr<LA_DIR>[]> paths(
       new std::unique_ptr<LA_DIR>[static_cast<std::size_t>(total)]);
   std::move(searchpaths.get(), searchpaths.get() + num_searchpaths, paths.get());
@@ -243,10 +249,11 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULL
 /// Finds the rules that lead from a file that exists to one of the wanted extension. For each
 /// rule, in the order of the set, a chain that produces its input is preferred to the input itself.
 ///
-/// A file of an extension that could not be had once is not tried again. That changes nothing: the
-/// attempt has gone through every rule from which the extension can be reached, and met none of
-/// the rules on its path, or it would have ended in a loop report. So none of those rules leads to
-/// it, from wherever it is wanted next, and the outcome is again that there is no such file.
+/// An input that could not be had once is not tried again. That changes nothing: the attempt has
+/// gone through every rule from which its extension can be reached, and met none of the rules on
+/// its path, or it would have ended in a loop report. So none of those rules leads to it, from
+/// wherever it is wanted next, and the outcome is again that there is no such file. Only another
+/// spelling of the extension is another file.
 short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
                               unsigned char* visited, LA_FULLFILE& source,
                               DARRAY_LA_RULE_CONST_PTR& chain) {
@@ -259,7 +266,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
   };
   const auto producers_of = [this](int extension) { return &index->producers(extension); };
   std::vector<level> path = {{producers_of(index->extension(wanted.get_ext())), 0}};
-  std::vector<bool> failed(index->num_extensions());
+  std::vector<bool> failed(index->num_spellings());
 
   while (path.back().tried < path.back().producers->size() || path.size() > 1) {
     if (path.back().tried == path.back().producers->size()) {
@@ -274,7 +281,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
         }
         return LA_FOUND;
       }
-      failed[static_cast<std::size_t>(index->needed(needing))] = true;
+      failed[index->spelling(needing)] = true;
       ++path.back().tried;
       continue;
     }
@@ -286,8 +293,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
       return LA_FAILED;
     }
     const char* only_name = rule.netlist_file->get_name();
-    if (failed[static_cast<std::size_t>(index->needed(i))] ||
-        (only_name != nullptr && !given.match_name(only_name))) {
+    if (failed[index->spelling(i)] || (only_name != nullptr && !given.match_name(only_name))) {
       ++path.back().tried;
       continue;
     }
@@ -382,6 +388,10 @@ struct LA_LAUNCHER::build_step {
   LA_FULLFILE input;
   LA_FULLFILE output;
   build_decision decision;
+  /// What is known of the files. The output of a step that did not run is, as the input of the
+  /// next one, not asked for again.
+  std::optional<Port::FileStatus> input_status = std::nullopt;
+  Port::FileStatus output_status = {};
 };
 
 /// The current directory of the process during a chain: back home at its end, whatever happens.
@@ -408,7 +418,7 @@ class LA_LAUNCHER::working_directory {
 
 short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
                                unsigned char top, char* netlist_path) {
-  LA_KEYWORD_TABLE options;
+  la_command_options options;
   set_options(options);
   working_directory directory;
   build_step step = {source, nullptr, source, LA_FULLFILE(*output_dir, source.get_tail()),
@@ -432,13 +442,14 @@ short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_C
       step.decision = LA_BUILD_AFTER_REBUILD;
     }
     step.input = step.output;
+    step.input_status = step.output_status;
   }
   UT_STR::Copy(netlist_path, step.output.get_fullfile());
   return LA_FOUND;
 }
 
 /// Sets every keyword but those of a step's files.
-void LA_LAUNCHER::set_options(LA_KEYWORD_TABLE& options) const {
+void LA_LAUNCHER::set_options(la_command_options& options) const {
   std::unique_ptr<PM_PIC> device;
   if (part_name != nullptr) {
     device = std::make_unique<PM_PIC>(part_name, 1, PM_PARTNAME_BINDING(0));
@@ -452,10 +463,11 @@ void LA_LAUNCHER::set_options(LA_KEYWORD_TABLE& options) const {
   options.set_keyword("add_pads", add_pads);
   options.set_keyword("quiet", quiet);
   options.set_keyword("aul", aul);
-  options.set_keyword("OUTPUT", output_dir->get_dir());
+  const char* directory = output_dir->get_dir();
+  options.set_name("OUTPUT", directory != nullptr ? directory : "");
   if (num_libraries == 0) options.set_keyword("libraries", nullptr);
   for (const la_text& library : counted(libraries, num_libraries)) {
-    options.add_keyword("libraries", library);
+    options.add_name("libraries", library.get());
   }
 }
 
@@ -467,8 +479,8 @@ void LA_LAUNCHER::decide(build_step& step) const {
     return;
   }
   if (step.decision == LA_BUILD_FORCED || step.decision == LA_BUILD_AFTER_REBUILD) return;
-  const Port::FileStatus output = status_of(step.output);
-  if (!output.exists) {
+  step.output_status = status_of(step.output);
+  if (!step.output_status.exists) {
     step.decision = LA_BUILD_MISSING;
     return;
   }
@@ -476,13 +488,13 @@ void LA_LAUNCHER::decide(build_step& step) const {
     step.decision = LA_BUILD_SKIPPED;
     return;
   }
-  const Port::FileStatus input = status_of(step.input);
-  if (!input.exists) {
+  if (!step.input_status) step.input_status = status_of(step.input);
+  if (!step.input_status->exists) {
     step.decision = LA_BUILD_NO_TIMESTAMP;
-  } else if (input.time > output.time) {
+  } else if (step.input_status->time > step.output_status.time) {
     step.decision = LA_BUILD_OUT_OF_DATE;
   } else {
-    step.decision = decide_by_dependency_files(rule, step.source, output.time);
+    step.decision = decide_by_dependency_files(rule, step.source, step.output_status.time);
   }
 }
 
@@ -507,22 +519,7 @@ bool LA_LAUNCHER::report_decision(const build_step& step) {
 
 namespace {
 
-/// The names of a step as they stand in a command line.
-struct step_names {
-  std::string infile;
-  std::string outfile;
-  std::string output_dir;
-};
-
-/// Expands the rule's template, which options holds, with these names.
-bool expand(LA_KEYWORD_TABLE& table, const step_names& names, char* options) {
-  table.set_keyword("infile", names.infile.c_str());
-  table.set_keyword("outfile", names.outfile.c_str());
-  table.set_keyword("OUTPUT", names.output_dir.c_str());
-  return table.expand(options, LA_MAX_OPTIONS);
-}
-
-/// A file as an argument: quoted, and not to be taken for an option.
+/// A file as an argument: quoted, and not to be taken for an option. Empty when it does not fit.
 std::string argument_of(const LA_FULLFILE& file) {
   const char* path = file.get_external_path();
   std::string argument(path != nullptr ? path : "");
@@ -530,48 +527,11 @@ std::string argument_of(const LA_FULLFILE& file) {
   return argument;
 }
 
-/// Stand-ins for the names of a step: characters that mean nothing in a command line.
-const step_names PLAIN_NAMES = {"\"\1\"", "\"\2\"", "\3"};
-
-/// Puts the names in the place of their stand-ins.
-std::string with_names(const std::string& word, const step_names& names) {
-  std::string result;
-  for (const char c : word) {
-    switch (c) {
-      case '\1':
-        result.append(names.infile, 1, names.infile.size() - 2);
-        break;
-      case '\2':
-        result.append(names.outfile, 1, names.outfile.size() - 2);
-        break;
-      case '\3':
-        result += names.output_dir;
-        break;
-      default:
-        result += c;
-    }
-  }
-  return result;
-}
-
-/// Whether a command line splits into the words that it would split into if its names were plain
-/// ones. If not, something in a name - a quote, or a blank where the template does not quote it -
-/// would make or change an argument.
-bool names_stay_in_place(const std::string& command, const std::string& plain_command,
-                         const step_names& names) {
-  std::vector<std::string> words;
-  std::vector<std::string> plain_words;
-  if (!Port_Process::Split(plain_command, plain_words)) return true;  // Not for a name's sake.
-  if (!Port_Process::Split(command, words)) return false;
-  for (std::string& word : plain_words) word = with_names(word, names);
-  return words == plain_words;
-}
-
 }  // namespace
 
 /// Runs the step's netlister and judges how it ended. False when the chain ends here.
 bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& directory,
-                                LA_KEYWORD_TABLE& options, unsigned char top) {
+                                la_command_options& options, unsigned char top) {
   if (directory.home().get_dir() == nullptr) {
     message().issueError(
         "Launcher: The current directory is gone, or too long to return to: %s is not run.\n",
@@ -619,35 +579,34 @@ void LA_LAUNCHER::enter_directory(const build_step& step, working_directory& dir
 }
 
 /// Makes the command line of the step.
-bool LA_LAUNCHER::make_command(const build_step& step, LA_KEYWORD_TABLE& options, unsigned char top,
-                               std::string& command) {
+bool LA_LAUNCHER::make_command(const build_step& step, la_command_options& options,
+                               unsigned char top, std::string& command) {
   const LA_RULE& rule = *step.rule;
   const char* options_template = top && rule.netlister_top_options != nullptr
                                      ? rule.netlister_top_options
                                      : rule.netlister_options;
   if (options_template == nullptr) options_template = "";
-  const step_names names = {argument_of(step.input), argument_of(step.output),
-                            output_dir->get_dir()};
-  if (names.infile.empty() || names.outfile.empty()) {
+  const std::string infile = argument_of(step.input);
+  const std::string outfile = argument_of(step.output);
+  if (infile.empty() || outfile.empty()) {
     message().issueError("Launcher: The name of %s is too long for a command line.\n",
-                         names.infile.empty() ? step.input.get_tail() : step.output.get_tail());
+                         infile.empty() ? step.input.get_tail() : step.output.get_tail());
     ++errors;
     return false;
   }
+  options.set_name("infile", infile);
+  options.set_name("outfile", outfile);
 
   char expanded[LA_MAX_OPTIONS];
-  const std::string start = std::string(rule.netlister ? rule.netlister.get() : "") + " ";
   UT_STR::Copy(expanded, options_template, sizeof expanded);
-  if (!expand(options, names, expanded)) {
+  if (!options.expand(expanded)) {
     message().issueError("Could not expand option string \"%s\"\n", expanded);
     errors += 2;
     return false;
   }
+  const std::string start = std::string(rule.netlister ? rule.netlister.get() : "") + " ";
   command = start + expanded;
-
-  UT_STR::Copy(expanded, options_template, sizeof expanded);
-  expand(options, PLAIN_NAMES, expanded);
-  if (names_stay_in_place(command, start + expanded, names)) return true;
+  if (options.keep_names_in_place(start, options_template, command)) return true;
   message().issueError(
       "Launcher: A file or directory name would change the arguments of %s, which is therefore not "
       "run: %s\n",

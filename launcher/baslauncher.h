@@ -3,15 +3,16 @@
 #define KESTREL_LAUNCHER_BASLAUNCHER_H
 
 #include <memory>
+#include <string>
 
 #include "file/baslafile.h"
 #include "host/port_process.h"
 #include "host/ut_darray.h"
 #include "host/ut_str.h"
 
-class LA_KEYWORD_TABLE;
 class LA_RULE;
 class LA_RULE_SET;
+class la_command_options;
 class la_rule_index;
 using DARRAY_LA_RULE_CONST_PTR = UT_TYPED_DARRAY<const LA_RULE*>;
 
@@ -61,8 +62,15 @@ class LA_LAUNCHER {
   ///
   /// Returns LA_FOUND; LA_NOT_FOUND when no rule and no file fits; LA_FAILED when an error has
   /// been reported, and errors has grown. In the last two cases both buffers are empty strings.
+  ///
+  /// Environment variables that switch, with any value: LAUNCHER_DETAIL, when set at construction,
+  /// adds messages on why and where; LA_TEST announces commands and starts none, so that the file
+  /// to read may not exist; LA_DISABLE looks for the name in lower case in the search directories
+  /// and does nothing else: no rules, no messages, and source_path stays empty.
   short find(const char* name, char* source_path, char* netlist_path, unsigned char top);
-  /// Appends search directories, to be searched after those that there are.
+  /// Appends search directories, to be searched after those that there are. A relative name is
+  /// relative to the current directory of this moment. More than 32767 in all are refused, with an
+  /// error message.
   void add_searchpaths(const char** searchpaths, short num_searchpaths);
 
   /// 1 when the rules were loaded and passed their checks.
@@ -95,13 +103,13 @@ class LA_LAUNCHER {
   class working_directory;
   short build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
                     unsigned char top, char* netlist_path);
-  void set_options(LA_KEYWORD_TABLE& options) const;
+  void set_options(la_command_options& options) const;
   void decide(build_step& step) const;
   bool report_decision(const build_step& step);
   bool run_netlister(const build_step& step, working_directory& directory,
-                     LA_KEYWORD_TABLE& options, unsigned char top);
+                     la_command_options& options, unsigned char top);
   void enter_directory(const build_step& step, working_directory& directory) const;
-  bool make_command(const build_step& step, LA_KEYWORD_TABLE& options, unsigned char top,
+  bool make_command(const build_step& step, la_command_options& options, unsigned char top,
                     std::string& command);
   bool execute(const LA_RULE& rule, const std::string& command);
 

@@ -9,7 +9,8 @@
 #include "rules/baslarules.h"
 
 /// Numbers the extensions that the rules name, ignoring the case of letters, and knows for each
-/// which rules produce it.
+/// which rules produce it. As files are looked for as they are spelt, it numbers the spellings of
+/// the extensions that rules need, too.
 class la_rule_index {
  public:
   explicit la_rule_index(const DARRAY_LA_RULE_PTR& rules) : producers_(1) {
@@ -17,7 +18,11 @@ class la_rule_index {
       const LA_RULE& rule = *rules.elements[i];
       // In a set that is not valid a rule may lack its files: it can then not be used.
       const bool usable = rule.netlist_file && rule.target;
-      needed_.push_back(add(usable ? rule.netlist_file->get_ext() : nullptr));
+      const char* needed = usable ? rule.netlist_file->get_ext() : nullptr;
+      needed_.push_back(add(needed));
+      const auto spelling =
+          spellings_.try_emplace(needed != nullptr ? needed : "", spellings_.size());
+      spelling_.push_back(spelling.first->second);
       const int made = add(usable ? rule.target->get_ext() : nullptr);
       if (made != NO_EXTENSION) producers_[static_cast<std::size_t>(made)].push_back(i);
     }
@@ -28,10 +33,11 @@ class la_rule_index {
     const auto found = ext != nullptr ? numbers_.find(key(ext)) : numbers_.end();
     return found != numbers_.end() ? found->second : NO_EXTENSION;
   }
-  /// One more than the highest number of an extension.
-  std::size_t num_extensions() const { return producers_.size(); }
   /// The extension of the rule's netlist file.
   int needed(int rule) const { return needed_[static_cast<std::size_t>(rule)]; }
+  /// The spelling of that extension, from 0 to num_spellings() - 1.
+  std::size_t spelling(int rule) const { return spelling_[static_cast<std::size_t>(rule)]; }
+  std::size_t num_spellings() const { return spellings_.size(); }
   /// The rules whose target has this extension, in the order of the set.
   const std::vector<int>& producers(int extension) const {
     return producers_[static_cast<std::size_t>(extension)];
@@ -57,6 +63,8 @@ class la_rule_index {
   std::unordered_map<std::string, int> numbers_;
   std::vector<std::vector<int>> producers_;
   std::vector<int> needed_;
+  std::unordered_map<std::string, std::size_t> spellings_;
+  std::vector<std::size_t> spelling_;
 };
 
 #endif

@@ -15,6 +15,7 @@
 /// One keyword with its values: strings owned by the entry, or a single null for no value.
 class LA_KEYWORD_ENTRY {
  public:
+  /// A keyword of this name, without values.
   explicit LA_KEYWORD_ENTRY(const char* name) : name(name), values(3) {}
   LA_KEYWORD_ENTRY(const LA_KEYWORD_ENTRY&) = delete;
   LA_KEYWORD_ENTRY& operator=(const LA_KEYWORD_ENTRY&) = delete;
@@ -22,6 +23,7 @@ class LA_KEYWORD_ENTRY {
 
   /// Appends a copy of value; null appends an absent value.
   void add_value(const char* value);
+  /// Removes all values.
   void clear_values();
   /// Issues one status message for each value.
   void dump() const;

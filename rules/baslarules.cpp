@@ -138,6 +138,10 @@ const char* name_of(const std::unique_ptr<LA_DIR>& dir) {
   return dir ? dir->get_dir() : nullptr;
 }
 
+const char* name_of(const std::unique_ptr<LA_FILE>& file) {
+  return file ? file->get_file() : nullptr;
+}
+
 }  // namespace
 
 LA_RULE::LA_RULE(const char* rule_name)
@@ -225,14 +229,14 @@ unsigned short LA_RULE::checker_result(int exit_code) const {
 
 void LA_RULE::dump(bool detail) const {
   if (!detail) {
-    message().issueStatus("Rule %s: %s => %s  %s %s\n", rule_name.get(), netlist_file->get_file(),
-                          target->get_file(), netlister.get(), netlister_options.get());
+    message().issueStatus("Rule %s: %s => %s  %s %s\n", rule_name.get(), name_of(netlist_file),
+                          name_of(target), netlister.get(), netlister_options.get());
     return;
   }
   message().issueStatus("\n");
   message().issueStatus("Rule: %s\n", rule_name.get());
-  message().issueStatus("Netlist File: %s\n", netlist_file->get_file());
-  message().issueStatus("Target: %s\n", target->get_file());
+  message().issueStatus("Netlist File: %s\n", name_of(netlist_file));
+  message().issueStatus("Target: %s\n", name_of(target));
   message().issueStatus("Netlister: %s\n", netlister.get());
   message().issueStatus("Netlister Options: %s\n", netlister_options.get());
   message().issueStatus("Netlister Top Options: %s\n", netlister_top_options.get());
@@ -360,6 +364,7 @@ struct rule_batch {
     rules.elements[rules.count - 1] = rule.release();
   }
   void move_to(DARRAY_LA_RULE_PTR& set) {
+    set.reserve(static_cast<std::uint64_t>(set.count) + static_cast<std::uint64_t>(rules.count));
     for (LA_RULE* rule : rules) set.append(rule);
     rules.a_resetnum(0);
   }
@@ -533,8 +538,14 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
   }
   LA_FULLFILE file(file_name);
   if (file.get_ext() == nullptr) file.set_ext("urf");
+  const char* full_name = file.get_fullfile();
+  if (full_name == nullptr && file.get_name() != nullptr) {
+    message().issueError(
+        "Launcher: User rules file \"%s\" has no full name of at most %d characters.\n", file_name,
+        LA_MAX_PATH - 1);
+    return false;
+  }
   if (!file.exists()) {
-    const char* full_name = file.get_fullfile();
     message().issueError("Launcher: User rules file \"%s\" does not exist.\n",
                          full_name != nullptr ? full_name : file_name);
     return false;
@@ -636,10 +647,14 @@ class system_rules_loader {
   }
 
   void read_dependency_files(LA_RULE& rule) {
-    for (short i = 0; i < SHRT_MAX; ++i) {
+    for (int i = 0; i <= SHRT_MAX; ++i) {
       const Port::StringBase<char> part =
-          reader_.GetStringByKey(rule.rule_name, ",", DEPENDENCY_FILES, "|", i);
+          reader_.GetStringByKey(rule.rule_name, ",", DEPENDENCY_FILES, "|", static_cast<short>(i));
       if (part.empty()) return;
+      if (part.length() >= LA_MAX_PATH) {
+        refuse_length(rule.rule_name, "Dependency file");
+        continue;
+      }
       const LA_FILE file(part.c_str());
       if (file.get_tail() == nullptr || file.get_head() != nullptr) {
         message().issueWarning(

@@ -34,6 +34,7 @@ enum : unsigned short {
 /// One entry of an exit-code list.
 class LA_STATUS {
  public:
+  /// An entry that means level for exit codes that stand in the relation op to code.
   LA_STATUS(unsigned short level, unsigned short op, int code) : level(level), op(op), code(code) {}
 
   /// Whether the entry speaks of this exit code.
@@ -66,9 +67,11 @@ class LA_RULE {
   LA_FILE* set_netlist_file(const char* text);
   LA_FILE* set_target(const char* text);
 
+  /// Appends a file, whose name and extension are put in the place of those of a chain's source.
   void add_dependency_file(const char* text);
   /// Makes this rule's list of dependency files a copy of that of other.
   void copy_dependency_files(const LA_RULE& other);
+  /// The number of dependency files.
   unsigned short num_dependency_files() const;
   bool has_dependency_files() const { return dependency_files && dependency_files->count > 0; }
 
@@ -98,8 +101,7 @@ class LA_RULE {
   unsigned short netlister_result(int exit_code) const;
   unsigned short checker_result(int exit_code) const;
 
-  /// Issues the rule as status messages: in one line, or every field. The rule has a netlist file
-  /// and a target.
+  /// Issues the rule as status messages: in one line, or every field.
   void dump(bool detail) const;
 
   la_text rule_name;
@@ -120,7 +122,6 @@ class LA_RULE {
 };
 
 using DARRAY_LA_RULE_PTR = UT_TYPED_DARRAY<LA_RULE*>;
-using DARRAY_LA_RULE_CONST_PTR = UT_TYPED_DARRAY<const LA_RULE*>;
 
 /// Checks the rules of one batch on their own and against each other, and issues what it finds.
 /// Returns whether there was no error. Changes nothing.

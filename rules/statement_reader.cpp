@@ -26,7 +26,9 @@ la_statement_reader::item_kind la_statement_reader::read_line() {
   ++line_number_;
   const auto kept = static_cast<int>(UT_STR::Len(line_));
   if (kept != length) {
+    // What stood on the line is not known. As a rule it ended a statement, and the next is read.
     line_[0] = '\0';
+    state_ = KEYWORD;
     return kept == LA_MAX_PATH - 1 ? LONG_LINE : ZERO_BYTE;
   }
   if (char* comment = std::strstr(line_, "//")) *comment = '\0';

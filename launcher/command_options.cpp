@@ -1,0 +1,70 @@
+#include "launcher/command_options.h"
+
+#include "launcher/baslauncher.h"
+
+namespace {
+
+std::string stand_in(std::size_t number) {
+  std::string text = std::to_string(number);
+  text.insert(text.begin(), '\1');
+  text.push_back('\1');
+  return text;
+}
+
+}  // namespace
+
+void la_command_options::set_keyword(const char* keyword, const char* value) {
+  real_.set_keyword(keyword, value);
+  plain_.set_keyword(keyword, value);
+}
+
+void la_command_options::set_name(const char* keyword, const std::string& name) {
+  real_.set_keyword(keyword, name.c_str());
+  plain_.set_keyword(keyword, stand_in_for(name).c_str());
+}
+
+void la_command_options::add_name(const char* keyword, const std::string& name) {
+  real_.add_keyword(keyword, name.c_str());
+  plain_.add_keyword(keyword, stand_in_for(name).c_str());
+}
+
+std::string la_command_options::stand_in_for(const std::string& name) {
+  const bool is_quoted = name.size() >= 2 && name.front() == '"' && name.back() == '"';
+  std::string text = stand_in(names_.size());
+  names_.push_back(is_quoted ? name.substr(1, name.size() - 2) : name);
+  if (is_quoted) {
+    text.insert(text.begin(), '"');
+    text.push_back('"');
+  }
+  return text;
+}
+
+unsigned char la_command_options::expand(char* options) const {
+  return real_.expand(options, LA_MAX_OPTIONS);
+}
+
+std::string la_command_options::with_names(std::string word) const {
+  for (std::size_t number = 0; number < names_.size(); ++number) {
+    const std::string text = stand_in(number);
+    const std::string& name = names_[number];
+    for (std::size_t at = word.find(text); at != word.npos;
+         at = word.find(text, at + name.size())) {
+      word.replace(at, text.size(), name);
+    }
+  }
+  return word;
+}
+
+bool la_command_options::keep_names_in_place(const std::string& start, const char* options_template,
+                                             const std::string& command) const {
+  char options[LA_MAX_OPTIONS];
+  UT_STR::Copy(options, options_template, sizeof options);
+  if (!plain_.expand(options, sizeof options)) return false;
+  std::vector<std::string> words;
+  std::vector<std::string> meant;
+  // Where the template itself cannot be split, that is not for a name's sake.
+  if (!Port_Process::Split(start + options, meant)) return true;
+  if (!Port_Process::Split(command, words)) return false;
+  for (std::string& word : meant) word = with_names(word);
+  return words == meant;
+}
