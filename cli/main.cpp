@@ -110,6 +110,9 @@ int resolve(settings& set, const console& shown) {
 
 int show_rules(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
+  if (rules.is_valid && rules.rules.count == 0) {
+    complain("there are no rules; do MYCORVANE and CORVANE name installation roots?");
+  }
   if (rules.is_valid && set.what == task::LIST_RULES) {
     const status_to_output redirected;
     rules.dump(set.detail);

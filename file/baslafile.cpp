@@ -205,7 +205,8 @@ unsigned char LA_DIR::set_dir(const char* path) {
     if (!joined.fits()) return set_dir();
     parts.dir = joined.chars();
   }
-  return set_dir(LA_DIR(std::move(parts.unc_host), std::move(parts.drive), std::move(parts.dir)));
+  *this = LA_DIR(std::move(parts.unc_host), std::move(parts.drive), std::move(parts.dir));
+  return 1;
 }
 
 unsigned char LA_DIR::set_dir(const LA_DIR& other) {
@@ -253,9 +254,9 @@ LA_FILE::LA_FILE(la_text head, la_text name, la_text ext)
 
 unsigned char LA_FILE::set_file(const char* path) {
   path_parts parts;
-  const bool usable = la_split_path(path, parts) && !parts.is_absolute();
-  if (!usable) return set_file(LA_FILE(la_text(), la_text(), la_text()));
-  return set_file(LA_FILE(std::move(parts.dir), std::move(parts.name), std::move(parts.ext)));
+  if (!la_split_path(path, parts) || parts.is_absolute()) parts = path_parts();
+  *this = LA_FILE(std::move(parts.dir), std::move(parts.name), std::move(parts.ext));
+  return names_file();
 }
 
 unsigned char LA_FILE::set_file(const LA_FILE& other) {
@@ -410,8 +411,7 @@ unsigned char LA_FULLFILE::set_part(la_text LA_FILE::*part, const char* text) {
     file = std::make_unique<LA_FILE>();
   }
   const unsigned char set = file->set_part(part, text);
-  if (!set && text != nullptr) file.reset();
-  return set;
+  return set || text == nullptr ? set : set_file();
 }
 
 unsigned char LA_FULLFILE::set_name(const char* name) {
@@ -423,6 +423,7 @@ unsigned char LA_FULLFILE::set_ext(const char* ext) {
 }
 
 unsigned char LA_FULLFILE::set_tail(const char* tail) {
+  if (tail != nullptr && UT_STR::Len(tail) >= LA_MAX_PATH) return set_file();
   if (file) return file->set_tail(tail);
   file = std::make_unique<LA_FILE>(tail);
   if (!file->names_file()) file.reset();
@@ -449,7 +450,7 @@ void LA_FULLFILE::append_full_name_to(la_path_text& text) const {
   dir->append_to(text);
   file->append_to(text);
   la_path_text normal;
-  if (text.fits() && normalise(text, normal)) text = normal;
+  if (text.fits() && normalise(la_path_text(text.chars()), normal)) text = normal;
 }
 
 const char* LA_FULLFILE::get_fullfile() const {
@@ -463,6 +464,7 @@ const char* LA_FULLFILE::get_external_path() const {
   if (!complete()) return nullptr;
   la_path_text full;
   append_full_name_to(full);
+  Port::File::makeunixpath(full.chars());
   la_path_text below = current_directory();
   Port::File::makeunixpath(below.chars());
   below.add_slash();

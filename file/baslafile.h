@@ -163,12 +163,14 @@ class LA_FULLFILE {
   /// current directory of this moment if it lies below it (ring, 4).
   const char* get_external_path() const;
 
-  /// Whether the part is there and equals the argument; null never matches.
+  /// Whether the part is there and equals the argument; null never matches. Tail and directory
+  /// take a slot of the ring.
   unsigned char match_name(const char* name) const { return file && file->match_name(name); }
   unsigned char match_ext(const char* ext) const { return file && file->match_ext(ext); }
   unsigned char match_tail(const char* tail) const { return file && file->match_tail(tail); }
   unsigned char match_dir(const char* path) const { return dir && dir->match_dir(path); }
-  /// Whether get_fullfile() and path are the same text; path is compared as it stands.
+  /// Whether get_fullfile() and path are the same text; path is compared as it stands. Takes the
+  /// slots of get_fullfile(), as exists() does, and get_timestamp() twice.
   unsigned char match_fullfile(const char* path) const;
   /// Whether there is such a file (a directory is none).
   unsigned char exists() const;

@@ -1,15 +1,43 @@
 #include "host/cvnform.h"
 
-#include <cstdarg>
-#include <cstdio>
-
 #include "host/ut_str.h"
+#include "host/utf8.h"
+
+// The analyzer does not see that the callers have started the list.
+// NOLINTBEGIN(clang-analyzer-valist.Uninitialized)
+std::string format_text(const char* format, va_list arguments) {
+  std::string text;
+  for (const char* f = format; *f != '\0'; ++f) {
+    if (*f != '%' || f[1] == '\0') {
+      text += *f;
+      continue;
+    }
+    switch (*++f) {
+      case 's':
+        if (const char* value = va_arg(arguments, const char*)) text += value;
+        break;
+      case 'z':
+        if (const wchar_t* value = va_arg(arguments, const wchar_t*)) text += to_utf8(value);
+        break;
+      case 'd':
+        text += std::to_string(va_arg(arguments, int));
+        break;
+      case 'c':
+        text += static_cast<char>(va_arg(arguments, int));
+        break;
+      default:
+        text += *f;
+    }
+  }
+  return text;
+}
+// NOLINTEND(clang-analyzer-valist.Uninitialized)
 
 char* cvnform(const char* format, ...) {
   static char text[LA_MAX_PATH];
   va_list arguments;
   va_start(arguments, format);
-  const int length = std::vsnprintf(text, sizeof text, format, arguments);
+  const std::string formatted = format_text(format, arguments);
   va_end(arguments);
-  return length >= 0 && length < LA_MAX_PATH ? text : nullptr;
+  return UT_STR::Copy(text, formatted.c_str());
 }

@@ -20,10 +20,10 @@ la_text entry(const StaticAcdRead& table, const char* device, short field, short
 /// The device of the table that name begins with, as a whole or up to a "-"; the longest of them.
 std::string device_of(const StaticAcdRead& table, const std::string& name) {
   std::string longest;
-  for (const std::string& device : table.keys()) {
+  for (const std::string_view device : table.keys()) {
     const char after = name.c_str()[std::min(device.size(), name.size())];
     if (device.size() > longest.size() && (after == '\0' || after == '-') &&
-        UT_STR::INCompare(name.c_str(), device.c_str(), device.size()) == 0) {
+        UT_STR::INCompare(name.c_str(), device.data(), device.size()) == 0) {
       longest = device;
     }
   }

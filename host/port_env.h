@@ -2,6 +2,7 @@
 #ifndef KESTREL_HOST_PORT_ENV_H
 #define KESTREL_HOST_PORT_ENV_H
 
+/// Read access to it.
 class Port_Env {
  public:
   /// The value of the environment variable, or null when it is not set. The text belongs to the

@@ -107,7 +107,8 @@ bool File::chdir(const char* path) {
 
 void File::getcwd(char* buffer, short size) {
   // A directory that the process cannot reach is not spelled with a leading slash.
-  if (::getcwd(buffer, static_cast<std::size_t>(size)) == nullptr || buffer[0] != '/') {
+  if (::getcwd(buffer, static_cast<std::size_t>(size)) == nullptr || buffer[0] != '/' ||
+      UT_STR::FindChar(buffer, '\\') != nullptr) {
     buffer[0] = '\0';
   }
 }

@@ -58,6 +58,7 @@ struct FileStatus {
   __int64 time = 0;     ///< modification time, in nanoseconds since 1970; 0 when there is none
 };
 
+/// The files of the process, by their names in either form.
 class File {
  public:
   /// Existence and modification time of path, with one question to the file system.
@@ -72,7 +73,8 @@ class File {
   /// Changes the current directory of the process. Returns false when that fails.
   static bool chdir(const char* path);
   /// Writes the current directory into buffer, which holds size characters; the empty string when
-  /// it cannot be determined or does not fit.
+  /// it cannot be determined, does not fit, or has a backslash in its name, which the path classes
+  /// would take for a separator.
   static void getcwd(char* buffer, short size);
   /// Turns every backslash of path into a forward slash, in place.
   static void makeunixpath(char* path);

@@ -1,6 +1,7 @@
-// The static initialisers of the portability layer. Each source file of the library holds one
-// object of each, in this order, from before its first use of a service to the end of the process.
-// The services here need no setting up: they come into being at their first use.
+// The static initialisers of the portability layer. Each of the sources of the exported
+// classes holds one object of each, in this order, from before its first use of a service to the
+// end of the process. The services here need no setting up: they come into being at their first
+// use.
 #ifndef KESTREL_HOST_PORT_INIT_H
 #define KESTREL_HOST_PORT_INIT_H
 

@@ -3,7 +3,7 @@
 #include <cstdio>
 #include <string>
 
-#include "host/utf8.h"
+#include "host/cvnform.h"
 
 namespace {
 
@@ -21,36 +21,6 @@ Port_MsgSink& sink() {
   static Port_MsgSink current = START_SINK;
   return current;
 }
-
-// The analyzer does not see that the callers have started the list.
-// NOLINTBEGIN(clang-analyzer-valist.Uninitialized)
-std::string formatted(const char* format, va_list arguments) {
-  std::string text;
-  for (const char* f = format; *f != '\0'; ++f) {
-    if (*f != '%' || f[1] == '\0') {
-      text += *f;
-      continue;
-    }
-    switch (*++f) {
-      case 's':
-        if (const char* value = va_arg(arguments, const char*)) text += value;
-        break;
-      case 'z':
-        if (const wchar_t* value = va_arg(arguments, const wchar_t*)) text += to_utf8(value);
-        break;
-      case 'd':
-        text += std::to_string(va_arg(arguments, int));
-        break;
-      case 'c':
-        text += static_cast<char>(va_arg(arguments, int));
-        break;
-      default:
-        text += *f;
-    }
-  }
-  return text;
-}
-// NOLINTEND(clang-analyzer-valist.Uninitialized)
 
 }  // namespace
 
@@ -71,7 +41,7 @@ Port_MsgManData& Port_MsgManData::createObject(const char* program, const char* 
 }
 
 void Port_MsgManData::issue(Port_MsgLevel level, const char* format, va_list arguments) const {
-  const std::string text = formatted(format, arguments);
+  const std::string text = format_text(format, arguments);
   const Port_MsgSink current = sink();
   current.function(current.context, {level, program_, file_, line_, revision_, text.c_str()});
 }

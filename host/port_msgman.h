@@ -44,6 +44,7 @@ class Port_MsgManData {
   /// until that message has been issued.
   static Port_MsgManData& createObject(const char* program, const char* file, int line,
                                        const char* revision);
+  /// Issue the message, at the level of their name.
   void issueStatus(const char* format, ...);
   void issueInfo(const char* format, ...);
   void issueWarning(const char* format, ...);

@@ -40,6 +40,7 @@ class PathList {
   std::vector<StringBase<char>> paths_;
 };
 
+/// The list of installation roots.
 class CvnenvPath {
  public:
   /// The installation roots of the process: the entries of the environment variable MYCORVANE,

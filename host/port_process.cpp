@@ -105,27 +105,38 @@ class line_cutter {
 
   void add(std::string_view text) {
     while (!text.empty()) {
-      const std::size_t stop = text.find('\n');
-      const std::size_t piece = stop == text.npos ? text.size() : stop + 1;
-      line_ += text.substr(0, piece);
-      text.remove_prefix(piece);
-      if (stop != text.npos || line_.size() >= LONGEST) flush();
+      const std::size_t length = std::min({text.find('\n'), text.size(), LONGEST - length_});
+      append(text.substr(0, length));
+      text.remove_prefix(length);
+      if (text.empty()) return;
+      if (text.front() == '\n') {
+        line_ += '\n';
+        text.remove_prefix(1);
+      }
+      flush();
     }
   }
   void flush() {
-    if (line_.empty()) return;
-    for (std::size_t at = line_.find('\0'); at != line_.npos; at = line_.find('\0', at)) {
-      line_.replace(at, 1, "\u2400");
-    }
-    process_.Output(line_.c_str());
+    if (!line_.empty()) process_.Output(line_.c_str());
     line_.clear();
+    length_ = 0;
   }
 
  private:
   static constexpr std::size_t LONGEST = 65536;
 
+  void append(std::string_view text) {
+    length_ += text.size();
+    for (std::size_t zero = text.find('\0'); zero != text.npos; zero = text.find('\0')) {
+      line_.append(text.substr(0, zero)).append("\u2400");
+      text.remove_prefix(zero + 1);
+    }
+    line_ += text;
+  }
+
   Port_Process& process_;
   std::string line_;
+  std::size_t length_ = 0;  ///< of the line, as the child wrote it
 };
 
 /// Reads at most limit bytes from the pipe, once. Returns how many; 0 at the end of the output,
@@ -168,7 +179,8 @@ void pass_output(pid_t child, int pipe, Port_Process& process) {
   for (;;) {
     const int ready = ::poll(events, 2, wait);
     if (ready < 0 && errno != EINTR) break;
-    if ((ready == 0 || (ready > 0 && events[1].revents != 0)) && has_ended(child)) {
+    const bool may_have_ended = end_of_child.get() < 0 || events[1].revents != 0;
+    if (ready >= 0 && may_have_ended && has_ended(child)) {
       read_rest(pipe, lines);
       break;
     }
@@ -178,6 +190,27 @@ void pass_output(pid_t child, int pipe, Port_Process& process) {
   }
   lines.flush();
 }
+
+/// Keeps SIGCHLD at its default action: one that is ignored, or handled by collecting whichever
+/// child there is, would take the exit code away.
+class default_child_signal {
+ public:
+  default_child_signal() {
+    struct sigaction action = {};
+    action.sa_handler = SIG_DFL;
+    ::sigaction(SIGCHLD, &action, &before_);
+  }
+  default_child_signal(const default_child_signal&) = delete;
+  default_child_signal& operator=(const default_child_signal&) = delete;
+  ~default_child_signal() {
+    ::sigaction(SIGCHLD, &before_, nullptr);
+    // It may have missed the end of another child.
+    if (before_.sa_handler != SIG_DFL && before_.sa_handler != SIG_IGN) ::raise(SIGCHLD);
+  }
+
+ private:
+  struct sigaction before_ = {};
+};
 
 /// Waits for the child. Returns 0 and sets its exit code, or returns the error number.
 int wait_for(pid_t child, int& exit_code) {
@@ -234,6 +267,7 @@ Port_Process::PROCESS_STATUS Port_Process::Run(const char* command) {
   if (mode_ == 2) {
     if (const int error = open_pipe(ends)) return fail(words[0], std::strerror(error));
   }
+  const default_child_signal while_it_runs;
   pid_t child = 0;
   if (const int error = child_start(ends.write.get()).spawn(words, child)) {
     return fail(words[0], std::strerror(error));

@@ -10,8 +10,8 @@
 /// No shell is involved. The command line is split at blanks (space and tab). A pair of double
 /// quotes groups characters and is dropped; so does a single quote that begins a word, up to the
 /// next single quote. Elsewhere a single quote is a character like any other, and nothing else
-/// has a meaning. The program is the text before the first blank; one without "/" is looked for in
-/// the directories of PATH.
+/// has a meaning. The program is the first word; one without "/" is looked for in the directories
+/// of PATH.
 class Port_Process {
  public:
   /// What Run returns.
@@ -27,13 +27,18 @@ class Port_Process {
   Port_Process& operator=(const Port_Process&) = delete;
 
   /// Gets each line that the program writes, in order, with its line end if it has one. A line
-  /// of more than 64 KiB comes in pieces; a zero byte comes as the character U+2400.
+  /// of more than 65536 characters comes in pieces of that length; a zero byte comes as the
+  /// character U+2400.
   virtual void Output(const char* text) = 0;
   virtual ~Port_Process() = default;
 
   /// Starts the command line in the current directory, with the environment of the process and
   /// standard input from /dev/null, and returns when the program has ended, even if something
   /// that it left behind still holds its output open.
+  ///
+  /// While it waits, SIGCHLD has its default action, so that a host that ignores it, or collects
+  /// every child, does not take the exit code away. A handler of the host is called once when it
+  /// is back, as it may have missed a child of its own.
   PROCESS_STATUS Run(const char* command);
   /// The exit code of the program that Run waited for; 128 + N when signal N ended it.
   int GetChildRetcode() const { return exit_code_; }

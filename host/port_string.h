@@ -20,10 +20,12 @@ class StringBase {
   /// What GetIndexOfString returns when there is no occurrence.
   static constexpr unsigned int NOT_FOUND = 0xFFFFFFFF;
 
+  /// An empty string, or a copy of text.
   StringBase() = default;
   StringBase(const Char* text) : text_(text) {}
   explicit StringBase(std::basic_string<Char> text) : text_(std::move(text)) {}
 
+  /// Append text.
   StringBase& operator+=(const Char* text) {
     text_ += text;
     return *this;
@@ -46,9 +48,11 @@ class StringBase {
 
   /// The characters, with a terminator; good until the string is changed or destroyed.
   const Char* c_str() const noexcept { return text_.c_str(); }
+  /// The number of characters, and whether it is 0.
   std::size_t length() const noexcept { return text_.length(); }
   bool empty() const noexcept { return text_.empty(); }
 
+  /// Whether both have the same characters, case included.
   friend bool operator==(const StringBase& a, const StringBase& b) { return a.text_ == b.text_; }
 
  private:

@@ -92,6 +92,7 @@ void StaticAcdRead::read_line(const char* path, int number, std::string_view lin
     return;
   }
   const auto [place, is_new] = records_.try_emplace(std::string(key));
+  if (is_new) keys_.emplace_back(place->first);
   last_value_ = is_new ? &place->second.value : &passed_over_;
   *last_value_ = trimmed(line.substr(equals + 1));
 }
@@ -123,10 +124,4 @@ std::string_view StaticAcdRead::field(const char* key, std::string_view separato
   asked.index = index;
   asked.start = start;
   return piece_at(asked.value, start, separator);
-}
-
-std::vector<std::string> StaticAcdRead::keys() const {
-  std::vector<std::string> names;
-  for (const auto& [key, record] : records_) names.push_back(key);
-  return names;
 }

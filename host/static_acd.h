@@ -21,6 +21,8 @@ class StaticAcdRead {
   /// and make valid() false. The other arguments are not used.
   StaticAcdRead(const char* path, const char*, char* const*, unsigned char, unsigned char,
                 unsigned char);
+  StaticAcdRead(const StaticAcdRead&) = delete;
+  StaticAcdRead& operator=(const StaticAcdRead&) = delete;
 
   /// The value of key, split at separator, field number index (from 0); when separator2 is not
   /// null, that field split at separator2, part number index2. An empty string when the key, the
@@ -29,8 +31,8 @@ class StaticAcdRead {
   Port::StringBase<char> GetStringByKey(const char* key, const char* separator, short index,
                                         const char* separator2, short index2) const;
 
-  /// All keys, in no order.
-  std::vector<std::string> keys() const;
+  /// All keys, in the order of the file; good as long as this object.
+  const std::vector<std::string_view>& keys() const { return keys_; }
   /// False when something of the file could not be read or understood.
   bool valid() const { return valid_; }
 
@@ -47,6 +49,7 @@ class StaticAcdRead {
   std::string_view field(const char* key, std::string_view separator, int index) const;
 
   mutable std::unordered_map<std::string, record> records_;
+  std::vector<std::string_view> keys_;
   std::string* last_value_ = nullptr;
   std::string passed_over_;  ///< the value of a key that stands earlier too
   bool valid_ = true;

@@ -25,7 +25,7 @@ void UT_DARRAY::qsort(int first, int last, Compare compare) {
 void UT_DARRAY::a_shift(int from, int by) {
   const int moved = count - from;
   if (by > 0) a_resetnum(count + by);
-  std::memmove(place(from + by), place(from), bytes(moved));
+  if (moved > 0) std::memmove(place(from + by), place(from), bytes(moved));
   if (by > 0) clearmem(place(from), std::min(by, moved));
   if (by < 0) count += by;
 }

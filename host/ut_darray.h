@@ -82,12 +82,15 @@ class UT_DARRAY : public UT_BASE_ARRAY {
 template <class Element>
 class UT_TYPED_DARRAY : public UT_DARRAY {
  public:
+  /// An empty array; step as in UT_DARRAY.
   explicit UT_TYPED_DARRAY(int step)
       : UT_DARRAY(reinterpret_cast<void**>(&elements), sizeof(void*), step, 0) {}
 
   using UT_DARRAY::a_resetnum;
 
+  /// Adds an element at the end.
   void append(Element element) { *static_cast<Element*>(getaddr(count)) = element; }
+  /// The elements in use, for a loop; good until the array grows.
   Element* begin() const { return elements; }
   Element* end() const { return elements + count; }
 

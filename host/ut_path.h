@@ -3,6 +3,7 @@
 #ifndef KESTREL_HOST_UT_PATH_H
 #define KESTREL_HOST_UT_PATH_H
 
+/// The conversion between the two.
 class UT_PATH {
  public:
   /// Converts path in place from the internal to the external form and returns it. On this

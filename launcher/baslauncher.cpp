@@ -161,7 +161,9 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
   if (fits && given.get_fullfile() != nullptr) return true;
   if (fits && LA_DIR(nullptr).get_dir() == nullptr) {
     message().issueError(
-        "Launcher: The current directory is gone, or too long for netlist \"%s\".\n", name);
+        "Launcher: The current directory cannot be used for netlist \"%s\": it is gone, too long, "
+        "or has a backslash in its name.\n",
+        name);
   } else {
     message().issueError(
         "Launcher: The full name of netlist \"%s\" is longer than %d characters.\n", name,
@@ -534,7 +536,8 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& direc
                                 la_command_options& options, unsigned char top) {
   if (directory.home().get_dir() == nullptr) {
     message().issueError(
-        "Launcher: The current directory is gone, or too long to return to: %s is not run.\n",
+        "Launcher: The current directory is gone, too long, or has a backslash in its name: %s is "
+        "not run.\n",
         step.rule->netlister.get());
     ++errors;
     return false;
@@ -608,8 +611,9 @@ bool LA_LAUNCHER::make_command(const build_step& step, la_command_options& optio
   command = start + expanded;
   if (options.keep_names_in_place(start, options_template, command)) return true;
   message().issueError(
-      "Launcher: A file or directory name would change the arguments of %s, which is therefore not "
-      "run: %s\n",
+      "Launcher: The name of a file or directory, or a library entry, would change the arguments "
+      "of "
+      "%s, which is therefore not run: %s\n",
       rule.netlister.get(), command.c_str());
   ++errors;
   return false;

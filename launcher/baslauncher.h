@@ -25,7 +25,9 @@ constexpr int LA_MAX_OPTIONS = 32768;
 /// The child process in which a netlister runs: what it writes is shown as status messages.
 class La_Port_Process : public Port_Process {
  public:
+  /// As Port_Process.
   explicit La_Port_Process(int mode) : Port_Process(mode) {}
+  /// Issues text as a status message, with no regard to any "%" in it.
   void Output(const char* text) override;
 };
 

@@ -1,5 +1,8 @@
 #include "launcher/command_options.h"
 
+#include <algorithm>
+#include <memory>
+
 #include "launcher/baslauncher.h"
 
 namespace {
@@ -30,8 +33,12 @@ void la_command_options::add_name(const char* keyword, const std::string& name) 
 
 std::string la_command_options::stand_in_for(const std::string& name) {
   const bool is_quoted = name.size() >= 2 && name.front() == '"' && name.back() == '"';
+  // The template language drops blanks at the front of a value where there are blanks already.
+  const std::size_t start = is_quoted ? 1 : std::min(name.find_first_not_of(' '), name.size());
+  const std::size_t end = name.size() - (is_quoted ? 1 : 0);
+  if (start == end && !is_quoted) return "";
   std::string text = stand_in(names_.size());
-  names_.push_back(is_quoted ? name.substr(1, name.size() - 2) : name);
+  names_.push_back(name.substr(start, end - start));
   if (is_quoted) {
     text.insert(text.begin(), '"');
     text.push_back('"');
@@ -57,13 +64,15 @@ std::string la_command_options::with_names(std::string word) const {
 
 bool la_command_options::keep_names_in_place(const std::string& start, const char* options_template,
                                              const std::string& command) const {
-  char options[LA_MAX_OPTIONS];
-  UT_STR::Copy(options, options_template, sizeof options);
-  if (!plain_.expand(options, sizeof options)) return false;
+  // Stand-ins may be longer than the names.
+  constexpr int SIZE = 4 * LA_MAX_OPTIONS;
+  const std::unique_ptr<char[]> options(new char[SIZE]);
+  UT_STR::Copy(options.get(), options_template, SIZE);
+  if (!plain_.expand(options.get(), SIZE)) return false;
   std::vector<std::string> words;
   std::vector<std::string> meant;
   // Where the template itself cannot be split, that is not for a name's sake.
-  if (!Port_Process::Split(start + options, meant)) return true;
+  if (!Port_Process::Split(start + options.get(), meant)) return true;
   if (!Port_Process::Split(command, words)) return false;
   for (std::string& word : meant) word = with_names(word);
   return words == meant;

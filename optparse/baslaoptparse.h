@@ -29,7 +29,7 @@ class LA_KEYWORD_ENTRY {
   void dump() const;
 
   la_text name;
-  DARRAY_NAME values;
+  DARRAY_NAME values;  ///< at least one in a table
 };
 
 using DARRAY_LA_KEYWORD_ENTRY_PTR = UT_TYPED_DARRAY<LA_KEYWORD_ENTRY*>;

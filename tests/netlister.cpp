@@ -13,6 +13,7 @@
 
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
 #include <fstream>
 #include <string>
 #include <vector>
@@ -41,7 +42,7 @@ void carry_out(const std::string& verb, const std::string& value,
   if (verb == "say") write_to(1, value + "\n");
   if (verb == "err") write_to(2, value + "\n");
   if (verb == "args") write_to(1, all(words));
-  if (verb == "dir") write_to(1, std::string(::get_current_dir_name()) + "\n");
+  if (verb == "dir") write_to(1, std::filesystem::current_path().string() + "\n");
   if (verb == "out") std::ofstream(value) << all(words);
   if (verb == "exit") std::exit(number);
   if (verb == "kill") ::raise(number);

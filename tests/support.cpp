@@ -28,19 +28,19 @@ void record(void* self, const Port_Msg& m) {
   static_cast<Messages*>(self)->records.push_back({m.level, origin, m.text});
 }
 
-std::string replace(std::string text, const std::string& from, const std::string& to) {
-  for (std::size_t at = text.find(from); at != text.npos; at = text.find(from, at + to.size())) {
-    text.replace(at, from.size(), to);
-  }
-  return text;
-}
-
 std::string slurp(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   return {std::istreambuf_iterator<char>(in), {}};
 }
 
 }  // namespace
+
+std::string replaced(std::string text, const std::string& from, const std::string& to) {
+  for (std::size_t at = text.find(from); at != text.npos; at = text.find(from, at + to.size())) {
+    text.replace(at, from.size(), to);
+  }
+  return text;
+}
 
 Messages::Messages() : before_(Port_MsgManData::setSink({record, this, true})) {}
 
@@ -107,11 +107,11 @@ void Tree::remove(const std::string& path) const {
 }
 
 std::string Tree::expand(std::string text) const {
-  return replace(std::move(text), "~", home);
+  return replaced(std::move(text), "~", home);
 }
 
 std::string Tree::shorten(std::string text) const {
-  return replace(std::move(text), home, "~");
+  return replaced(std::move(text), home, "~");
 }
 
 Ran run(const std::vector<std::string>& words, const std::string& input) {
@@ -135,6 +135,40 @@ Ran run(const std::vector<std::string>& words, const std::string& input) {
              slurp(base + "/err")};
   fs::remove_all(base);
   return ran;
+}
+
+std::vector<std::vector<std::string>> table(const std::string& text) {
+  std::vector<std::vector<std::string>> rows;
+  std::istringstream lines(text);
+  for (std::string line; std::getline(lines, line);) {
+    if (line.empty()) continue;
+    rows.emplace_back();
+    line = " " + line + "  | ";
+    for (std::size_t at = 0; (at = line.find(" | ")) != line.npos; line.erase(0, at + 3)) {
+      const std::size_t start = std::min(line.find_first_not_of(' '), at);
+      const std::size_t end = line.find_last_not_of(' ', at) + 1;
+      rows.back().push_back(line.substr(start, std::max(end, start) - start));
+    }
+  }
+  return rows;
+}
+
+std::string unescape(const std::string& text) {
+  const std::string lines = replaced(replaced(text, "\\n", "\n"), "\\r", "\r");
+  return replaced(replaced(lines, "\\t", "\t"), "\\0", std::string(1, '\0'));
+}
+
+void expect_table(const std::string& text,
+                  const std::function<std::string(const std::string&)>& f) {
+  for (const auto& row : table(text)) {
+    EXPECT_EQ(f(unescape(row[0])), row.size() > 1 ? unescape(row[1]) : "") << row[0];
+  }
+}
+
+std::string shown(std::initializer_list<const char*> texts) {
+  std::string all;
+  for (const char* text : texts) all += std::string(" ") + (text != nullptr ? text : "-");
+  return all.substr(1);
 }
 
 int main(int count, char** words) {

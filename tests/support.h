@@ -2,6 +2,7 @@
 #ifndef KESTREL_TESTS_SUPPORT_H
 #define KESTREL_TESTS_SUPPORT_H
 
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
@@ -85,6 +86,20 @@ struct Ran {
 /// Runs a program in the current directory, with nothing on its standard input unless some is
 /// given.
 Ran run(const std::vector<std::string>& words, const std::string& input = "");
+
+/// text with every occurrence of from replaced by to.
+std::string replaced(std::string text, const std::string& from, const std::string& to);
+
+/// The rows of a table: its lines, cut into cells at " | ". Blanks around cells and empty lines do
+/// not count.
+std::vector<std::vector<std::string>> table(const std::string& text);
+
+/// text with the characters that "\n", "\r", "\t" and "\0" in it stand for.
+std::string unescape(const std::string& text);
+/// Expects of each row of a table that f makes the second cell of the first one, both unescaped.
+void expect_table(const std::string& text, const std::function<std::string(const std::string&)>& f);
+/// Texts with a blank between them, "-" for null.
+std::string shown(std::initializer_list<const char*> texts);
 
 /// Programs of the build.
 extern const char* const KESTREL_LAUNCH;
