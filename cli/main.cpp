@@ -80,6 +80,11 @@ void print_result(const settings& set, const std::string& name, short result, co
   std::fflush(stdout);
 }
 
+/// Whether the library starts no netlisters, so that what it names need not be there.
+bool is_dry_run() {
+  return std::getenv("LA_TEST") != nullptr;
+}
+
 int resolve(settings& set, const console& shown) {
   const auto array = [](std::vector<const char*>& texts) {
     return texts.empty() ? nullptr : texts.data();
@@ -96,7 +101,11 @@ int resolve(settings& set, const console& shown) {
     }
     char source[LA_MAX_PATH];
     char netlist[LA_MAX_PATH];
-    const short result = launcher.find(name.c_str(), source, netlist, set.top);
+    short result = launcher.find(name.c_str(), source, netlist, set.top);
+    if (result == LA_FOUND && !is_dry_run() && !Port::File::exist(netlist)) {
+      complain(std::string("no netlister has written ") + netlist);
+      result = LA_FAILED;
+    }
     print_result(set, name, result, source, netlist);
     if (result == LA_FAILED) status = FAILED;
     if (result == LA_NOT_FOUND) {

@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <climits>
 #include <cstring>
+#include <limits>
 
 namespace Port {
 
@@ -99,6 +100,12 @@ bool File::getdatetime(const char* path, __int64& time) {
   const FileStatus found = status(path);
   if (found.exists) time = found.time;
   return found.exists;
+}
+
+bool File::setoldest(const char* path) {
+  // The system takes the nearest time that the file system can hold.
+  const timespec times[] = {{0, UTIME_OMIT}, {std::numeric_limits<time_t>::min(), 0}};
+  return ::utimensat(AT_FDCWD, path, times, 0) == 0;
 }
 
 bool File::chdir(const char* path) {

@@ -70,6 +70,9 @@ class File {
   /// Sets time to the modification time of path, in nanoseconds since 1970. Returns false, and
   /// leaves time alone, when there is no such file.
   static bool getdatetime(const char* path, __int64& time);
+  /// Sets the modification time of path to the oldest that its file system knows. Returns false
+  /// when that fails.
+  static bool setoldest(const char* path);
   /// Changes the current directory of the process. Returns false when that fails.
   static bool chdir(const char* path);
   /// Writes the current directory into buffer, which holds size characters; the empty string when

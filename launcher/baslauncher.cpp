@@ -546,7 +546,29 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& direc
   std::string command;
   if (!make_command(step, options, top, command)) return false;
   message().issueStatus("Launcher: Executing %s\n", command.c_str());
-  return Port_Env::GetEnv("LA_TEST") != nullptr || execute(*step.rule, command);
+  if (Port_Env::GetEnv("LA_TEST") != nullptr) return true;
+  const Port::FileStatus before = status_of(step.output);
+  if (execute(*step.rule, command)) return true;
+  distrust(step.output, before);
+  return false;
+}
+
+/// Sees to it that what a failed run has written is not taken for up to date later: it gets the
+/// oldest time stamp that there is. Its content stays for whoever wants to look into it.
+void LA_LAUNCHER::distrust(const LA_FULLFILE& output, const Port::FileStatus& before) {
+  const Port::FileStatus after = status_of(output);
+  if (!after.exists || (before.exists && after.time == before.time)) return;
+  if (!Port::File::setoldest(output.get_fullfile())) {
+    message().issueWarning(
+        "Launcher: %s comes from a failed run, and its time stamp could not be set back: remove "
+        "it\n",
+        output.get_tail());
+    ++warnings;
+  } else if (detail) {
+    message().issueStatus(
+        "Launcher: %s comes from a failed run, its time stamp is set back: it will be made again\n",
+        output.get_tail());
+  }
 }
 
 /// Goes to the directory that the rule asks for. Where it cannot be entered, the netlister runs

@@ -114,6 +114,7 @@ class LA_LAUNCHER {
   bool make_command(const build_step& step, la_command_options& options, unsigned char top,
                     std::string& command);
   bool execute(const LA_RULE& rule, const std::string& command);
+  void distrust(const LA_FULLFILE& output, const Port::FileStatus& before);
 
   la_text part_name;
   std::unique_ptr<LA_DIR> output_dir;

@@ -71,9 +71,9 @@ bool la_command_options::keep_names_in_place(const std::string& start, const cha
   if (!plain_.expand(options.get(), SIZE)) return false;
   std::vector<std::string> words;
   std::vector<std::string> meant;
-  // Where the template itself cannot be split, that is not for a name's sake.
-  if (!Port_Process::Split(start + options.get(), meant)) return true;
-  if (!Port_Process::Split(command, words)) return false;
+  // A template that cannot be split, for want of a quote, must not find its partner in a name.
+  const bool is_meant = Port_Process::Split(start + options.get(), meant);
+  if (Port_Process::Split(command, words) != is_meant) return false;
   for (std::string& word : meant) word = with_names(word);
-  return words == meant;
+  return !is_meant || words == meant;
 }

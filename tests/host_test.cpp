@@ -1,15 +1,182 @@
 // The services of the host layer.
-#include <gtest/gtest.h>
+#include <signal.h>
+#include <unistd.h>
 
-#include "host/ut_str.h"
+#include <chrono>
+#include <filesystem>
+
+#include "host/pm_devkey.h"
+#include "host/port_file.h"
+#include "host/port_pathlist.h"
+#include "host/port_process.h"
+#include "host/static_acd.h"
+#include "host/ut_darray.h"
+#include "host/utf8.h"
 #include "support.h"
 
-TEST(Strings, GetToken) {
-  char line[] = "RuleName = r1 ;";
-  char token[sizeof line];
-  EXPECT_EQ(UT_STR::GetToken(line, token, " =;"), ' ');
-  EXPECT_STREQ(token, "RuleName");
-  EXPECT_STREQ(line, "= r1 ;");
-  EXPECT_EQ(UT_STR::GetToken(line, token, " =;"), '=');
-  EXPECT_STREQ(token, "");
+struct Host : testing::Test {
+  Tree tree;
+};
+
+TEST_F(Host, StringsAndArrays) {
+  std::string numbers;
+  for (const char* text : {"+7", "-08", "9223372036854775807", "-9223372036854775808", "", "+", "-",
+                           "+-1", "-+1", "--1", "1x", " 1", "1 ", "0x1", "9223372036854775808"}) {
+    long value = 0;
+    numbers += UT_STR::StrToL(text, value) ? std::to_string(value) + " " : "-";
+  }
+  EXPECT_EQ(numbers, "7 -8 9223372036854775807 -9223372036854775808 -----------");
+  // Only letters have two cases.
+  EXPECT_TRUE(UT_STR::ICompare("aZ", "Az") == 0 && UT_STR::ICompare("[", "{") != 0);
+  char letters[] = "abcdefg";
+  DARRAY_NAME array(2);
+  for (int i = 0; i < 7; ++i) array.append(letters + i);
+  for (int i = 0; i < 7; ++i) EXPECT_EQ(array.elements[i], letters + i);
+  array.a_resetnum(0);
+  EXPECT_TRUE(*static_cast<char**>(array.getaddr(9)) == nullptr && array.elements[0] == nullptr);
+}
+
+TEST_F(Host, LinesAcrossBlocks) {
+  const std::string mark = "\xEF\xBB\xBF";
+  const std::string block(16384, 'x');
+  const std::string lines[] = {block.substr(4), "", mark + "\r", block + block, "a\r"};
+  tree.write("f", mark);
+  for (const auto& l : lines) tree.write("f", tree.read("f") + l + (l == "a\r" ? "" : "\r\n"));
+  const std::unique_ptr<Port::Stream> stream(Port::File::open("f", Port::Stream::READ, true));
+  for (const std::string& line : lines) {
+    char buffer[LA_MAX_PATH];
+    EXPECT_EQ(stream->readline(buffer, sizeof buffer), static_cast<int>(line.size()));
+    EXPECT_EQ(buffer, line.substr(0, LA_MAX_PATH - 1));
+  }
+  EXPECT_TRUE(stream->geteof() && !stream->failed());
+}
+
+TEST_F(Host, Messages) {
+  Messages outer;
+  {
+    Messages inner;
+    Port_MsgManData::createObject("Kestrel", "f.cpp", 12, "r1")
+        .issueInfo("%s|%s|%d|%c|%%|%z", "a%d", nullptr, -5, 'x', L"\x7FF\x800\xFFFF\x10FFFF");
+    EXPECT_EQ(inner.records.at(0).origin, "f.cpp:12 r1");
+    Port_MsgManData::debugStub("%s", "trace");
+    EXPECT_EQ(inner.take(), "I a%d||-5|x|%|\u07FF\u0800\uFFFF\U0010FFFFD trace");
+  }
+  Port_MsgSink quiet = Port_MsgManData::setSink({nullptr, nullptr, false});
+  quiet.debug = false;
+  Port_MsgManData::setSink(quiet);
+  Port_MsgManData::debugStub("nobody asked");
+  Port_MsgManData::createObject("Kestrel", "f.cpp", 1, "r1").issueWarning("100%");
+  EXPECT_EQ(outer.take(), "W 100%");
+  // Stray, overlong, cut off, overlong, surrogate, beyond the last character.
+  for (const std::string bad : {"\x80", "\xC0\xAF", "\xC3", "\xE0\x80\x80", "\xED\xA0\x80", "\xF5"})
+    EXPECT_EQ(from_utf8(bad + "\u07FF"), std::wstring(bad.size(), 0xFFFD) + L'\x7FF') << bad.size();
+}
+
+TEST_F(Host, InstallationRoots) {
+  const auto roots = [](const char* mine, const char* common) {
+    const Variable first("MYCORVANE", mine);
+    const Variable second("CORVANE", common);
+    std::string all;
+    for (const auto& root : Port::CvnenvPath::GetInstance()) all += shown({root.c_str(), ""});
+    return all;
+  };
+  EXPECT_EQ(roots("/m:/n//", "/c") + roots("", nullptr), "/m /n /c ");
+  EXPECT_EQ(roots(nullptr, "::/c/::d:") + roots("/", nullptr), "/c d / ");
+  EXPECT_EQ(roots(nullptr, nullptr),
+            replaced(KESTREL_LAUNCH, "bin/kestrel-launch", "share/kestrel-launcher "));
+}
+
+TEST_F(Host, StaticData) {
+  // The first three fields of k.
+  const auto fields = [this](const std::string& content) {
+    tree.write("f", "\xEF\xBB\xBF" + content);
+    Messages messages;
+    const StaticAcdRead file("f", nullptr, nullptr, 1, 0, 1);
+    EXPECT_EQ(file.valid(), messages.records.empty());
+    std::string all[3];
+    for (const int i : {2, 0, 1, 2, 0}) {
+      all[i] = file.GetStringByKey("k", ",", static_cast<short>(i), nullptr, 0).c_str();
+      file.GetStringByKey("k", "|", 1, nullptr, 0);
+    }
+    const std::string said = replaced(messages.take(), "E Launcher: \"f\", line ", "");
+    return all[0] + "/" + all[1] + "/" + all[2] + "/" + said;
+  };
+  expect_table(fields, R"(
+k =,\t,x y\t\nl = x                      | //x y/
+k = a,\r\n  b\n\n# c\r\n\tc#d #e\n  # f  | a/b c#d//
+k =\n a,\n b = c, e\nk = 2,\n 3\nK = 4\n | a/b = c/e/
+x\nk = 1\n= 2\n                          | 1///1: Expecting KEY = VALUE\n3: Expecting KEY = VALUE\n
+# c\n\n c\nk = \0\n                      | ///3: Expecting KEY = VALUE\n4: Expecting KEY = VALUE\n)");
+}
+
+TEST_F(Host, PartNamesAndTheirData) {
+  tree.write("root/data/devices.acd", "LF=one,T\nLF-12=two,T|b 9,6|7\nbare=three\nNoFamily=\n");
+  tree.write("root2/data/devices.acd", "bare = four, T\nSecond = five, T\n");
+  tree.make("root/data/d.acd root2/data/d.acd root/data/two/d.acd root2/data/five/d.acd");
+  const Variable roots("CORVANE", tree.expand("~/root:~/root2").c_str());
+  const auto device = [this](const std::string& part) {
+    PM_PIC p(part.c_str(), 1, PM_PARTNAME_BINDING(0));
+    if (!p.is_valid(1, 0)) return std::string("invalid");
+    const std::string all = shown({p.get_family(), p.get_device(), p.get_package(), p.get_speed()});
+    return all + ";" + tree.shorten(PM_DEVKEY("d.acd", &p, 0, 1, 1).getlocation());
+  };
+  expect_table(device, R"(
+lf-t        | one LF T -;
+lf-12-B 9-7 | two LF-12 b 9 7;~/root/data/two/d.acd
+second-t    | five Second T -;~/root2/data/five/d.acd
+NOFAMILY    | - NoFamily - -;~/root/data/d.acd)");
+  for (const char* part : {"LF-12-T-8", "LF-12-6", "LF-12-T-6-x", "LF-12-T-", "LF-12-", "LF-12--6",
+                           "LF-12X", "LF-T-6", "L", "bare-T", "-T", ""}) {
+    EXPECT_EQ(device(part), "invalid") << part;
+  }
+}
+
+/// Runs a command, "$" standing for the test netlister. Tells the exit code and what each call of
+/// Output got, or why it failed.
+static std::string ran(const std::string& command) {
+  struct recorder : Port_Process {
+    recorder() : Port_Process(2) {}
+    void Output(const char* text) override { output += text + std::string("/"); }
+    std::string output;
+  } process;
+  const int failed = process.Run(replaced(command, "$", TEST_NETLISTER).c_str());
+  if (failed) return to_utf8(process.GetProcessErrmsg());
+  return std::to_string(process.GetChildRetcode()) + ": " + process.output;
+}
+
+TEST_F(Host, Processes) {
+  const auto descriptors = [] {
+    return std::distance(std::filesystem::directory_iterator("/proc/self/fd"), {});
+  };
+  tree.make("plain text d/");
+  std::filesystem::permissions("text", std::filesystem::perms::owner_all);
+  const auto on_child = ::signal(SIGCHLD, SIG_IGN);
+  const auto before = descriptors();
+  expect_table(ran, R"(
+$ say=a err=b say=c exit=3     | 3: a\n/b\n/c\n/
+$ args\ta\  it's '' "" # *;|<\t | 0: [args][a\][it's][][][#][*;|<]\n/
+$ args "a b"c"d e" 'x "y"' 'z' | 0: [args][a bcd e][x "y"][z]\n/
+$ args 'a'"b c"'d' e" '"' f'g  | 0: [args][ab c'd'][e ''][f'g]\n/
+$ say=a kill=15                | 143: a\n/
+$ say=a close sleep=50 exit=4  | 4: a\n/
+sh -c "cat; printf 'a\nb'"     | 0: a\n/b/
+printf a\x00b\n\x00            | 0: a␀b\n/␀/
+plain                          | plain: No such file or directory
+./plain                        | ./plain: Permission denied
+./text                         | ./text: Exec format error
+'' $ say=a                     | "": the name of the program is empty
+x "y                           | x "y: a quote is without its partner
+x 'y                           | x 'y: a quote is without its partner)");
+  EXPECT_EQ(ran("") + ran(" $ say=a"), ran("''") + ran("''"));
+  EXPECT_EQ(descriptors(), before);
+  ::signal(SIGCHLD, on_child);
+}
+
+TEST_F(Host, LongLinesAndLeftBehindProcesses) {
+  const std::string piece(65536, '0');
+  const std::string pieces = piece + "/" + piece + "\n/" + piece + "/0/";
+  EXPECT_EQ(ran("printf %0131072d\\n%065537d 0 0"), "0: " + pieces);
+  const auto start = std::chrono::steady_clock::now();
+  EXPECT_EQ(ran("$ leave=30 say=a exit=5"), "5: a\n/");
+  EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(20));
 }

@@ -124,6 +124,7 @@ Ran run(const std::vector<std::string>& words, const std::string& input) {
     ::dup2(::open((base + "/out").c_str(), O_CREAT | O_WRONLY, 0600), 1);
     ::dup2(::open((base + "/err").c_str(), O_CREAT | O_WRONLY, 0600), 2);
     std::vector<char*> arguments;
+    arguments.reserve(words.size() + 1);
     for (const std::string& word : words) arguments.push_back(const_cast<char*>(word.c_str()));
     arguments.push_back(nullptr);
     ::execvp(arguments[0], arguments.data());
@@ -143,7 +144,7 @@ std::vector<std::vector<std::string>> table(const std::string& text) {
   for (std::string line; std::getline(lines, line);) {
     if (line.empty()) continue;
     rows.emplace_back();
-    line = " " + line + "  | ";
+    line.insert(0, " ").append("  | ");
     for (std::size_t at = 0; (at = line.find(" | ")) != line.npos; line.erase(0, at + 3)) {
       const std::size_t start = std::min(line.find_first_not_of(' '), at);
       const std::size_t end = line.find_last_not_of(' ', at) + 1;
@@ -158,8 +159,8 @@ std::string unescape(const std::string& text) {
   return replaced(replaced(lines, "\\t", "\t"), "\\0", std::string(1, '\0'));
 }
 
-void expect_table(const std::string& text,
-                  const std::function<std::string(const std::string&)>& f) {
+void expect_table(const std::function<std::string(const std::string&)>& f,
+                  const std::string& text) {
   for (const auto& row : table(text)) {
     EXPECT_EQ(f(unescape(row[0])), row.size() > 1 ? unescape(row[1]) : "") << row[0];
   }

@@ -2,6 +2,8 @@
 #ifndef KESTREL_TESTS_SUPPORT_H
 #define KESTREL_TESTS_SUPPORT_H
 
+#include <gtest/gtest.h>
+
 #include <functional>
 #include <optional>
 #include <string>
@@ -97,7 +99,7 @@ std::vector<std::vector<std::string>> table(const std::string& text);
 /// text with the characters that "\n", "\r", "\t" and "\0" in it stand for.
 std::string unescape(const std::string& text);
 /// Expects of each row of a table that f makes the second cell of the first one, both unescaped.
-void expect_table(const std::string& text, const std::function<std::string(const std::string&)>& f);
+void expect_table(const std::function<std::string(const std::string&)>& f, const std::string& text);
 /// Texts with a blank between them, "-" for null.
 std::string shown(std::initializer_list<const char*> texts);
 

@@ -1,0 +1,99 @@
+// The guides hold to what the system does: docs/rules.md shows what its samples really give, and
+// the man page names exactly the options that there are.
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <iterator>
+#include <regex>
+#include <sstream>
+#include <utility>
+
+#include "cli/settings.h"
+#include "optparse/baslaoptparse.h"
+#include "support.h"
+
+namespace {
+
+std::string guide(const std::string& name) {
+  std::ifstream in(KESTREL_SOURCE_DIR "/docs/" + name);
+  return {std::istreambuf_iterator<char>(in), {}};
+}
+
+/// Runs the samples of a guide one after the other; each finds what those before it have left.
+struct Samples {
+  Samples() { tree.write("sample.urf", ""); }
+
+  /// What a sample of this kind is to read. What is found on loading one is to be in a sample of
+  /// the kind "messages" right behind it.
+  std::string again(const std::string& kind, const std::string& text) {
+    std::string result = std::exchange(findings, "");
+    if (kind.starts_with("rules")) return result + load("sample.urf", kind, text);
+    if (kind.starts_with("acd")) return result + load("root/data/larules.acd", kind, text);
+    if (kind == "devices") return result + load("root/data/devices.acd", kind, text);
+    std::istringstream lines(kind == "messages" ? "" : text);
+    for (std::string line; std::getline(lines, line);) {
+      if (kind == "templates") result += expand(line);
+      if (kind == "console" && line[0] == '$') result += line + "\n" + output_of(line.substr(1));
+    }
+    return result;
+  }
+  std::string load(const std::string& path, const std::string& kind, const std::string& text) {
+    const std::string before = tree.read(path);
+    tree.write(path, text);
+    findings = output_of("kestrel-launch --check -u sample.urf >/dev/null");
+    EXPECT_EQ(!findings.empty(), kind.ends_with("-error")) << text;
+    if (!findings.empty()) tree.write(path, before);
+    return text;
+  }
+  /// A line that is the value of a keyword, or a template and what it expands to.
+  std::string expand(const std::string& line) {
+    const std::size_t arrow = line.find(" => ");
+    const std::size_t equals = line.find(" = ");
+    if (arrow == line.npos) {
+      const char* value = equals == line.npos ? nullptr : line.c_str() + equals + 3;
+      table.add_keyword(line.substr(0, equals).c_str(), value);
+      return line + "\n";
+    }
+    char options[LA_MAX_PATH] = "";
+    line.copy(options, line.rfind('"', arrow) - 1, 1);
+    if (table.expand(options)) return line.substr(0, arrow + 4) + "\"" + options + "\"\n";
+    return line.substr(0, arrow + 4) + "error: " + messages.take().erase(0, 2);
+  }
+  std::string output_of(const std::string& line) const {
+    return tree.shorten(run({"sh", "-c", "exec 2>&1; PATH=" KESTREL_BIN_DIR ":$PATH;" + line}).out);
+  }
+
+  Tree tree;
+  Messages messages;
+  LA_KEYWORD_TABLE table;
+  std::string findings;
+};
+
+TEST(Docs, SamplesGiveWhatTheGuideShows) {
+  const std::string text = guide("rules.md");
+  const std::regex fence("```([^\n]*)\n([^`]*)```\n");
+  Samples samples;
+  for (std::sregex_iterator m(text.begin(), text.end(), fence), end; m != end; ++m) {
+    EXPECT_EQ(m->prefix().str().find("```"), text.npos) << m->prefix();
+    EXPECT_EQ(samples.again(m->str(1), m->str(2)), m->str(2));
+  }
+  EXPECT_EQ(samples.findings, "");
+}
+
+TEST(Docs, ManPageNamesTheOptionsThatThereAre) {
+  const std::string page =
+      std::regex_replace(guide("kestrel-launch.1"), std::regex("\\\\(f.|(?=-))"), "");
+  const std::string help = help_text();
+  for (const option& o : all_options()) {
+    std::string item = o.short_name != nullptr ? o.short_name + std::string(", ") : "";
+    item.append(o.long_name).append(o.argument != nullptr ? " " : "");
+    if (o.argument != nullptr) item += o.argument;
+    EXPECT_NE(page.find("\n.TP\n" + item + "\n"), page.npos) << item;
+  }
+  const std::regex long_name("--[a-z-]+");
+  for (std::sregex_iterator at(page.begin(), page.end(), long_name), end; at != end; ++at) {
+    EXPECT_NE(help.find(at->str() + " "), help.npos) << at->str();
+  }
+}
+
+}  // namespace
