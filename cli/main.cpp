@@ -105,6 +105,8 @@ int resolve(settings& set, const console& shown) {
     if (result == LA_FOUND && !is_dry_run() && !Port::File::exist(netlist)) {
       complain(std::string("no netlister has written ") + netlist);
       result = LA_FAILED;
+      source[0] = '\0';
+      netlist[0] = '\0';
     }
     print_result(set, name, result, source, netlist);
     if (result == LA_FAILED) status = FAILED;
