@@ -15,7 +15,7 @@ class Command : public testing::Test {
   Command() : path_("PATH", tree_.full("bin").c_str()) {
     tree_.make("bin/ out/ d.edf g.v e.kbc -x.kbc s/f.kbc");
     std::filesystem::create_symlink(TEST_NETLISTER, "bin/nl");
-    tree_.write("root/data/larules.acd", R"(RULES = a, b, c
+    tree_.write("share/data/larules.acd", R"(RULES = a, b, c
 a = .edf,.kbo,.x,nl,args out=$outfile,out=ran [$ignore_locs] [$add_pads] [$quiet] [$aul] {$libraries }$infile,$OUTPUT,chk,/w,0,,!0,<2
 b = top.vhd,.edf,,nl,,,,,,>1
 c = .v,.edf,,nl,,exit=1,,,,0)");
@@ -51,12 +51,12 @@ none "" e                   | 2 | ~/e.kbc\n | kestrel-launch: not found: none\nE
 g.v none                    | 2 |  | Launcher: Executing nl exit=1\nERROR: nl exited with errors (return code 1).\nkestrel-launch: not found: none\n
 --names-from names e        | 1 | ~/e.kbc\n~/e.kbc\n~/-x.kbc\n | kestrel-launch: not found: none\n
 e.x             | 0 | ~/e.kbc\n | WARNING: Launcher: Could not find file ~/e with extension x in the search path. Ignoring extension.\n
--n -d -i --not-top -o out -l x -l y d.edf | 0 | ~/out/d.kbo\n | Launcher: Using rule a\nLauncher: d.kbo being compiled because it does not exist\nLauncher: Running nl from ~/out/\nLauncher: Environment inherited by nl will be:\nLauncher:    MYCORVANE is unset\nLauncher:    CORVANE is ~/root\nLauncher:    PATH is ~/bin\nLauncher: Executing nl out=ran x y "~/d.edf"\n
+-n -d -i --not-top -o out -l x -l y d.edf | 0 | ~/out/d.kbo\n | Launcher: Using rule a\nLauncher: d.kbo being compiled because it does not exist\nLauncher: Running nl from ~/out/\nLauncher: Environment inherited by nl will be:\nLauncher:    MYCORVANE is unset\nLauncher:    CORVANE is ~/share\nLauncher:    PATH is ~/bin\nLauncher: Executing nl out=ran x y "~/d.edf"\n
 )");
   check("--names-from - | 0 | ~/e.kbc\\n~/-x.kbc\\n |", "e\n\n-x.kbc\r\n");
   EXPECT_FALSE(std::filesystem::exists("out/ran"));
-  check(
-      R"(--not-top -r -q -o out d.edf | 2 |  | Launcher: Executing nl out=ran -r -quiet "~/d.edf"\nkestrel-launch: no netlister has written ~/out/d.kbo\n)");
+  check(R"(
+--json --not-top -r -q -o out d.edf | 2 | {"name":"d.edf","result":-1,"source":"","netlist":""}\n{"ok":true,"errors":0,"warnings":0}\n | Launcher: Executing nl out=ran -r -quiet "~/d.edf"\nkestrel-launch: no netlister has written ~/out/d.kbo\n)");
   EXPECT_TRUE(std::filesystem::exists("out/ran"));
 }
 

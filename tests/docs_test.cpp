@@ -28,8 +28,8 @@ struct Samples {
   std::string again(const std::string& kind, const std::string& text) {
     std::string result = std::exchange(findings, "");
     if (kind.starts_with("rules")) return result + load("sample.urf", kind, text);
-    if (kind.starts_with("acd")) return result + load("root/data/larules.acd", kind, text);
-    if (kind == "devices") return result + load("root/data/devices.acd", kind, text);
+    if (kind.starts_with("acd")) return result + load("share/data/larules.acd", kind, text);
+    if (kind == "devices") return result + load("share/data/devices.acd", kind, text);
     std::istringstream lines(kind == "messages" ? "" : text);
     for (std::string line; std::getline(lines, line);) {
       if (kind == "templates") result += expand(line);

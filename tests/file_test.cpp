@@ -103,7 +103,7 @@ TEST_F(Names, RingOfResults) {
 TEST_F(Names, TooLongIsRefusedWhole) {
   const auto many = [](std::size_t count) { return std::string(count, 'x'); };
   const std::size_t left = 259 - tree.home.size();
-  for (const std::size_t over : {0, 1}) {
+  for (const std::size_t over : {0U, 1U}) {
     const LA_FILE file(many(259 + over).c_str());
     const LA_DIR dir(("/" + many(257 + over)).c_str());
     const LA_DIR joined(many(left - 2 + over).c_str());
@@ -111,7 +111,7 @@ TEST_F(Names, TooLongIsRefusedWhole) {
     const LA_FULLFILE quoted(("/" + many(256 + over)).c_str());
     for (const char* name : {file.get_tail(), dir.get_dir(), joined.get_dir(), full.get_fullfile(),
                              quoted.get_external_path()}) {
-      EXPECT_EQ(shown({name}).size(), over == 0 ? 259 : 1);
+      EXPECT_EQ(shown({name}).size(), over == 0 ? 259U : 1U);
     }
   }
 }

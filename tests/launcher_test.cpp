@@ -12,8 +12,6 @@
 #include "launcher/baslauncher.h"
 #include "support.h"
 
-// NOLINTBEGIN(performance-inefficient-string-concatenation): texts are put together as they read.
-
 namespace {
 
 /// Messages with the long ones in short, and ", " between lines.
@@ -22,7 +20,7 @@ std::string in_short(std::string text) {
       {"S Launcher: ", ""},
       {"Executing nl ", "run "},
       {"Environment inherited by nl will be:\n   MYCORVANE is unset\n", "+ "},
-      {"   CORVANE is ~/root\n   PATH is ~/bin\n", "+ "},
+      {"   CORVANE is ~/share\n   PATH is ~/bin\n", "+ "},
       {"NOT compiling d.kbo because its source was not found", "no source of d.kbo"},
       {"I Found resolution for 'd.kbc' using the search path (-sd switches):\n\t", "I d.kbc is "},
       {"\nOther matching files found later in the search path will not be used:\n\t", ", not "},
@@ -38,8 +36,8 @@ std::string in_short(std::string text) {
 struct World {
   /// rules: default rules, with "; " for line ends.
   explicit World(const std::string& rules) {
-    tree.write("root/data/larules.acd", replaced(rules, "; ", "\n"));
-    tree.write("root/data/devices.acd", "D-1 = fam, P1|P2, 3");
+    tree.write("share/data/larules.acd", replaced(rules, "; ", "\n"));
+    tree.write("share/data/devices.acd", "D-1 = fam, P1|P2, 3");
     std::filesystem::create_directory("bin");
     std::filesystem::create_symlink(TEST_NETLISTER, "bin/nl");
   }
@@ -371,5 +369,3 @@ d.kbc            | -u <999> -sd <259> -sd <260> -sd // d | E Launcher: User rule
   }
   check(rows);
 }
-
-// NOLINTEND(performance-inefficient-string-concatenation)

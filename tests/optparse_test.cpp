@@ -117,11 +117,11 @@ struct Naive {
 
 TEST(Templates, Expand) {
   expect_table([](const std::string& text) { return Table().expanded(text); }, R"(
--p $part {-l $libraries } [$quiet] $in      | <-p dev1 -l /a -l /b top.edf>
-[ $quiet]  -p   $part   $lead  x$lead$lead  | <-p   dev1 v x  v v  >
-$PART$part2{-$empty }$infile$partial[x]{x}  | <dev1dev12- top.edfdev1>
--[a $part [b $quiet]]{c[ $quiet$lead]$part} | <-a dev1 cdev1>
-[$part $other_1]                            | 217 Undefined keyword "other_" in option string\n)");
+-p $part {-l $libraries } [$quiet] [$empty] $in | <-p dev1 -l /a -l /b top.edf>
+[ $quiet]  -p   $part   $lead  x$lead$lead      | <-p   dev1 v x  v v  >
+$PART$part2{-$empty }$infile$partial[x]{x}      | <dev1dev12- top.edfdev1>
+-[a $part [b $quiet]]{c[ $quiet$lead]$part}     | <-a dev1 cdev1>
+[$part $other_1]                                | 217 Undefined keyword "other_" in option string\n)");
 }
 
 TEST(Templates, AgreeWithTheRules) {

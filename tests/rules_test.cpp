@@ -127,7 +127,8 @@ TEST_F(Rules, UserFileLimits) {
   EXPECT_EQ(reads("//" + std::string(258, 'x')), "1: Line is longer than 259 characters\n(0)");
   const auto value = "@r Netlister=\"" + std::string(150, 'x') + "\n" + std::string(109, 'x');
   EXPECT_EQ(reads(value + "\";").substr(0, 268), "r,.a,.k," + std::string(259, 'x') + ",");
-  EXPECT_EQ(reads(value + "x\nx\"; @s"), "2: Value is longer than 259 characters\n(2)");
+  EXPECT_EQ(reads(replaced(value, "Netlister", "RuleName") + "x\nx\"; @s"),
+            "2: Value is longer than 259 characters\n(2)");
   EXPECT_EQ(reads(std::string(32766, '\n') + "@r"), "r@;");
   EXPECT_EQ(reads(std::string(32767, '\n') + "@r"), "32767: File has more than 32767 lines\n(0)");
   EXPECT_EQ(reads("@r\n" + std::string(2, '\0') + "\n@s"), "2: Line holds a zero byte\n(2)");
@@ -149,7 +150,7 @@ p     | Could not open user rules file "p".\n(0))");
 
 TEST_F(Rules, SystemFiles) {
   const auto load = [this](const std::string& content) {
-    tree.write("root/data/larules.acd", "RULES=" + content);
+    tree.write("share/data/larules.acd", "RULES=" + content);
     return loaded(nullptr, nullptr);
   };
   expect_table(load, R"(
@@ -159,7 +160,7 @@ r\nr=.a,.k,d/x|s/,n,,,,,,0,,,,,,x        | r - Dependency file d/x is not a plai
 r,s\nr=.b,.k,,n,,,,,,0\ns=,none          | 594 s - NetlistFile is required.\n605 s - TargetExtension is required.\n632 s - Netlister is required.\n703 s - There must be at least one of the following: NetlisterSuccessStatus, NetlisterWarningStatus, or NetlisterFatalStatus.\n(0)
 r\nr=.a,.k,,n,,,,c,,x,!,1x,1 2,=,-       | 670 r - Invalid exit code for NetlisterSuccessStatus.\n682 r - Invalid exit code for NetlisterWarningStatus.\n694 r - Invalid exit code for NetlisterFatalStatus.\n703 r - There must be at least one of the following: NetlisterSuccessStatus, NetlisterWarningStatus, or NetlisterFatalStatus.\n715 r - Invalid exit code for CheckerSuccessStatus.\n727 r - Invalid exit code for CheckerWarningStatus.\n739 r - Invalid exit code for CheckerFatalStatus.\n749 r - There myst be at least one of the following: CheckerSuccessStatus, CheckerWarningStatus, or CheckerFatalStatus.\n(0)
 r,s\nr=.a,.k,,n,,,,,,0\ns=.A,.K,,n,,,,,,0 | Rule r redefines rule s\n(0)
-r\n= x\nr=.a,.k,,n,,,,,,0                | "~/root/data/larules.acd", line 2: Expecting KEY = VALUE\n(0))");
+r\n= x\nr=.a,.k,,n,,,,,,0                | "~/share/data/larules.acd", line 2: Expecting KEY = VALUE\n(0))");
   const std::string value(260, 'x');
   const std::string found = load("r\nr=.a,.k,," + value + ",,,,,,0") + load(value);
   EXPECT_LT(found.find("r - Netlister is longer than 259 characters.\n(0)"), found.size());
@@ -167,10 +168,10 @@ r\n= x\nr=.a,.k,,n,,,,,,0                | "~/root/data/larules.acd", line 2: Ex
 }
 
 TEST_F(Rules, FamilyDefaultAndReplacement) {
-  const Variable roots("CORVANE", tree.expand("~/root:~/root2:~/root3").c_str());
-  tree.write("root/data/devices.acd", "D = fam, P, 1\n");
-  tree.write("root2/data/fam/larules.acd", "RULES=f\nf=.A,.K,e.x|.z,n,,,,,,NONE,2\n");
-  tree.write("root3/data/larules.acd", "RULES=d\nd=.a,.k,.y,m,top,opt,$OUTPUT,c,d,9,8,!0,7\n");
+  const Variable roots("CORVANE", tree.expand("~/share:~/share2:~/share3").c_str());
+  tree.write("share/data/devices.acd", "D = fam, P, 1\n");
+  tree.write("share2/data/fam/larules.acd", "RULES=f\nf=.A,.K,e.x|.z,n,,,,,,NONE,2\n");
+  tree.write("share3/data/larules.acd", "RULES=d\nd=.a,.k,.y,m,top,opt,$OUTPUT,c,d,9,8,!0,7\n");
   write_rules("@u NetlisterOptions=NONE;NetlisterFatalStatus=none;");
   EXPECT_EQ(loaded("d-p", "u"),
             R"(u,.a,.k,n,,top,3,,c,,4,~/d/,success = 0,fatal NONE 0,warning = 2,success = 7+e.x+.z
@@ -183,8 +184,8 @@ d,.a,.k,m,opt,top,3,,c,,4,~/d/,success = 9,warning = 8,fatal ! 0,success = 7+.y
   EXPECT_EQ(messages.take(), "E Launcher: x is not a valid PM name.\n");
   const Variable allowed("CVN_KESTREL_ALLOW_PLF", "");
   EXPECT_EQ(loaded(nullptr, nullptr).substr(0, 6), "d,.a,.");
-  tree.write("root2/data/laplfrules.acd", "RULES=p\np=.a,.k,,n,,,,,,0\n");
-  tree.write("root3/data/laplfrules.acd", "RULES=q\n");
+  tree.write("share2/data/laplfrules.acd", "RULES=p\np=.a,.k,,n,,,,,,0\n");
+  tree.write("share3/data/laplfrules.acd", "RULES=q\n");
   const std::string trace = "CVN_KESTREL_ALLOW_PLF is set. Using rules file for plf2kdb.\n";
   EXPECT_EQ(replaced(loaded("D", nullptr), trace, "T"),
             replaced("TTpp", "p", "p,.a,.k,n,,,0,,,,0,,success = 0\n"));

@@ -64,8 +64,8 @@ Tree::Tree() : before_(fs::current_path()) {
   std::string name = fs::temp_directory_path() / "kestrel-XXXXXX";
   home = fs::canonical(::mkdtemp(name.data()));
   fs::current_path(home);
-  fs::create_directories(full("root/data"));
-  root_.emplace("CORVANE", full("root").c_str());
+  fs::create_directories(full("share/data"));
+  root_.emplace("CORVANE", full("share").c_str());
 }
 
 Tree::~Tree() {

@@ -47,7 +47,7 @@ class Variable {
 };
 
 /// A new directory that is the current one while this lives, and an installation root in it:
-/// root/data/. Both are removed at the end.
+/// share/data/. Both are removed at the end.
 class Tree {
  public:
   Tree();
