@@ -179,6 +179,7 @@ int main(int count, char** words) {
   }
   ::setenv("LC_ALL", "C", 1);
   ::setenv("TZ", "UTC", 1);
+  ::setenv("PATH", "/usr/bin:/bin", 1);
   ::testing::InitGoogleTest(&count, words);
   return RUN_ALL_TESTS();
 }
