@@ -212,7 +212,7 @@ TEST(Plan, DoesWhatANaivePlannerDoes) {
   std::mt19937 random(20);
   const auto any = [&](const std::vector<std::string>& of) { return of[random() % of.size()]; };
   const auto ext = [&](const char* last) { return any({"a", "A", "b", "c", "e", last}); };
-  for (int i = 0; i < 100; ++i) {
+  for (int i = 0; i < 80; ++i) {
     World world("");
     NaivePlanner naive;
     for (auto j = random() % 8; j > 0; --j) naive.files.insert(any({"d.", "s/d."}) + ext("kbo"));
