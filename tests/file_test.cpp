@@ -64,8 +64,7 @@ TEST_F(Names, MatchesAndFiles) {
   const LA_FULLFILE file("s/../s/x.e");
   EXPECT_TRUE(file.match_name("X") && file.match_ext("E") && file.match_tail("X.E"));
   EXPECT_TRUE(file.match_dir(tree.home.c_str()) && file.match_fullfile(tree.full("S/X.E").c_str()));
-  EXPECT_FALSE(file.match_ext(".e") || file.match_ext(nullptr) || file.match_dir("."));
-  EXPECT_FALSE(file.match_fullfile(tree.full("./s/x.e").c_str()));
+  EXPECT_FALSE(file.match_ext(".e") || file.match_fullfile(tree.full("./s/x.e").c_str()));
   __int64 time = 7;
   for (const char* name : {"s/d.e", "s/y.e", "s/x.e/z", "s/"}) {
     EXPECT_FALSE(LA_FILE(name).exists() || LA_FULLFILE(name).get_timestamp(time)) << name;

@@ -62,7 +62,7 @@ TEST_F(Host, Messages) {
   }
   Port_MsgSink quiet = Port_MsgManData::setSink({nullptr, nullptr, false});
   quiet.debug = false;
-  Port_MsgManData::setSink(quiet);
+  EXPECT_NE(Port_MsgManData::setSink(quiet).function, nullptr);
   Port_MsgManData::debugStub("nobody asked");
   Port_MsgManData::createObject("Kestrel", "f.cpp", 1, "r1").issueWarning("100%");
   EXPECT_EQ(outer.take(), "W 100%");
@@ -150,6 +150,7 @@ TEST_F(Host, Processes) {
   tree.make("plain text d/");
   std::filesystem::permissions("text", std::filesystem::perms::owner_all);
   for (const int number : {SIGCHLD, SIGTERM}) ::signal(number, SIG_IGN);
+  EXPECT_NE(std::freopen("plain", "r", stdin), nullptr);
   const auto before = descriptors();
   expect_table(ran, R"(
 $ say=a err=b say=c exit=3     | 3: a\n/b\n/c\n/

@@ -104,7 +104,7 @@ TEST_F(Rules, UserFiles) {
 @r Netlister = x ; Netlister = a/b"c" ; Checker = ;     | r,.a,.k,a/bc,,,0,,,,0,,success = 0\n
 @r @s NetlistFile = b.a ;                               | s,b.a,.k,,,,0,,,,0,,success = 0\nr@;
 RuleName\n= r ;\n@r ; x ;                               | 1: Expecting keyword\n3: Expecting keyword\n(1)
-a b = ; c ;\nd ; @r                                     | 1: Expecting "="\n1: Expecting "="\n(1)
+a b=; a b = ; c ;\nd ; @r                               | 1: Expecting "="\n1: Expecting "="\n1: Expecting "="\n(1)
 @r Netlister = a//b ;\n                                 | 1: Expecting value\nUnexpected end of file\n(1)
 @r Netlister = a b ;\n@s Checker = "a" b;               | 1: Expecting ";"\n2: Expecting ";"\nUnexpected end of file\n(2)
 1=b; @r\n1 = b ; a = "b                                 | 1: Rule does not have a RuleName\n2: Unexpected key word 1\nUnexpected end of file\n(1)
