@@ -3,7 +3,10 @@
 //   settings   reads the command line; holds the table of options
 //   console    shows messages and makes JSON
 //   graph      draws the rules
+//   signals    ends the netlister when the command is to end
 //   main       does what the command line asks for
+#include <signal.h>
+
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
@@ -15,7 +18,9 @@
 #include "cli/console.h"
 #include "cli/graph.h"
 #include "cli/settings.h"
+#include "cli/signals.h"
 #include "host/port_file.h"
+#include "host/port_interrupt.h"
 #include "launcher/baslauncher.h"
 #include "rules/baslarules.h"
 
@@ -94,7 +99,9 @@ int resolve(settings& set, const console& shown) {
                        set.output_dir, set.user_rules, set.force, set.ignore_timestamps,
                        set.ignore_locs, set.add_pads, set.quiet, set.aul);
   int status = launcher.ok ? ALL_FOUND : FAILED;
-  for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
+  const signal_handling while_it_resolves;
+  const auto goes_on = [] { return Port_Interrupt::Requested() == 0 && !std::ferror(stdout); };
+  for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
     const std::string& name = set.names[i];
     if (shown.is_terminal() && set.names.size() > 1) {
       std::fprintf(stderr, "[%zu/%zu] %s\n", i + 1, set.names.size(), name.c_str());
@@ -177,7 +184,10 @@ int run_command_line(int count, const char* const* words) {
 
 int main(int count, char** words) {
   try {
-    return run_command_line(count - 1, words + 1);
+    const int status = run_command_line(count - 1, words + 1);
+    // Who interrupts the command shall see that it has ended so.
+    if (const int signal = Port_Interrupt::Requested()) ::raise(signal);
+    return status;
   } catch (const std::exception& failure) {
     complain(failure.what());
     return FAILED;

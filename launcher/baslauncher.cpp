@@ -13,6 +13,7 @@
 #include "host/pm_pic.h"
 #include "host/port_env.h"
 #include "host/port_init.h"
+#include "host/port_interrupt.h"
 #include "host/port_msgman.h"
 #include "host/port_string.h"
 #include "launcher/command_options.h"
@@ -644,7 +645,14 @@ bool LA_LAUNCHER::make_command(const build_step& step, la_command_options& optio
 /// Runs a command line and judges its exit code by the rule.
 bool LA_LAUNCHER::execute(const LA_RULE& rule, const std::string& command) {
   La_Port_Process process(2);
-  if (process.Run(command.c_str()) != Port_Process::PROCESS_ENDED) {
+  const Port_Process::PROCESS_STATUS status = process.Run(command.c_str());
+  if (Port_Interrupt::Requested() != 0) {
+    // Whatever its exit code says: it may have been cut short.
+    message().issueError("Launcher: %s was interrupted.\n", rule.netlister.get());
+    ++errors;
+    return false;
+  }
+  if (status != Port_Process::PROCESS_ENDED) {
     message().issueError("Failed to launch program %z\n", process.GetProcessErrmsg());
     ++errors;
     return false;
