@@ -83,7 +83,8 @@ class child_start {
     sigset_t signals;
     ::sigemptyset(&signals);
     ::posix_spawnattr_setsigmask(&attributes_, &signals);
-    ::sigfillset(&signals);
+    // sigfillset leaves out the signals of the C library, and the child would ignore them.
+    std::memset(&signals, 0xFF, sizeof signals);
     ::posix_spawnattr_setsigdefault(&attributes_, &signals);
   }
   child_start(const child_start&) = delete;

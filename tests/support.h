@@ -86,8 +86,9 @@ struct Ran {
 };
 
 /// Runs a program in the current directory, with nothing on its standard input unless some is
-/// given.
-Ran run(const std::vector<std::string>& words, const std::string& input = "");
+/// given. meanwhile is called with its number, which is also that of a process group.
+Ran run(const std::vector<std::string>& words, const std::string& input = "",
+        const std::function<void(pid_t)>& meanwhile = [](pid_t) {});
 
 /// text with every occurrence of from replaced by to.
 std::string replaced(std::string text, const std::string& from, const std::string& to);
