@@ -2,11 +2,13 @@
 //
 //   settings   reads the command line; holds the table of options
 //   console    shows messages and makes JSON
+//   explain    tells why
 //   graph      draws the rules
 //   signals    ends the netlister when the command is to end
 //   main       does what the command line asks for
 #include <signal.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
@@ -16,6 +18,7 @@
 #include <vector>
 
 #include "cli/console.h"
+#include "cli/explain.h"
 #include "cli/graph.h"
 #include "cli/settings.h"
 #include "cli/signals.h"
@@ -90,14 +93,34 @@ bool is_dry_run() {
   return std::getenv("LA_TEST") != nullptr;
 }
 
-int resolve(settings& set, const console& shown) {
+LA_LAUNCHER launcher_of(settings& set) {
   const auto array = [](std::vector<const char*>& texts) {
     return texts.empty() ? nullptr : texts.data();
   };
-  LA_LAUNCHER launcher(set.part, array(set.search_dirs), static_cast<short>(set.search_dirs.size()),
-                       array(set.libraries), static_cast<short>(set.libraries.size()),
-                       set.output_dir, set.user_rules, set.force, set.ignore_timestamps,
-                       set.ignore_locs, set.add_pads, set.quiet, set.aul);
+  return {set.part,
+          array(set.search_dirs),
+          static_cast<short>(set.search_dirs.size()),
+          array(set.libraries),
+          static_cast<short>(set.libraries.size()),
+          set.output_dir,
+          set.user_rules,
+          set.force,
+          set.ignore_timestamps,
+          set.ignore_locs,
+          set.add_pads,
+          set.quiet,
+          set.aul};
+}
+
+/// The exit status after one more name.
+int worse(int status, short result) {
+  return std::max(status, result == LA_FAILED      ? int{FAILED}
+                          : result == LA_NOT_FOUND ? int{NOT_ALL_FOUND}
+                                                   : int{ALL_FOUND});
+}
+
+int resolve(settings& set, const console& shown) {
+  LA_LAUNCHER launcher = launcher_of(set);
   int status = launcher.ok ? ALL_FOUND : FAILED;
   const signal_handling while_it_resolves;
   const auto goes_on = [] { return Port_Interrupt::Requested() == 0 && !std::ferror(stdout); };
@@ -116,13 +139,33 @@ int resolve(settings& set, const console& shown) {
       netlist[0] = '\0';
     }
     print_result(set, name, result, source, netlist);
-    if (result == LA_FAILED) status = FAILED;
-    if (result == LA_NOT_FOUND) {
-      complain("not found: " + name);
-      if (status == ALL_FOUND) status = NOT_ALL_FOUND;
-    }
+    if (result == LA_NOT_FOUND) complain("not found: " + name);
+    status = worse(status, result);
   }
   if (set.json) print_totals(launcher.ok, launcher.errors, launcher.warnings);
+  return status;
+}
+
+int explain(settings& set) {
+  LA_LAUNCHER launcher = launcher_of(set);
+  int status = launcher.ok ? ALL_FOUND : FAILED;
+  std::string error;
+  // The explanation says what the messages say, and the errors are its answers.
+  const diversion diverted([&error](const Port_Msg& message) {
+    if (message.level == PORT_MSG_ERROR) error += message.text;
+    return message.level != PORT_MSG_WARNING;
+  });
+  for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
+    LA_EXPLANATION why;
+    launcher.explain_to(&why);
+    char source[LA_MAX_PATH];
+    char netlist[LA_MAX_PATH];
+    error.clear();
+    const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
+    if (i > 0) std::puts("");
+    std::fputs(explained({set.names[i], result, netlist, error}, why).c_str(), stdout);
+    status = worse(status, result);
+  }
   return status;
 }
 
@@ -132,7 +175,9 @@ int show_rules(const settings& set) {
     complain("there are no rules; do MYCORVANE and CORVANE name installation roots?");
   }
   if (rules.is_valid && set.what == task::LIST_RULES) {
-    const status_to_output redirected;
+    const diversion to_output([](const Port_Msg& message) {
+      return message.level == PORT_MSG_STATUS && std::fputs(message.text, stdout) >= 0;
+    });
     rules.dump(set.detail);
   }
   if (rules.is_valid && set.what == task::GRAPH) std::fputs(graph_of(rules.rules).c_str(), stdout);
@@ -146,7 +191,7 @@ int show_rules(const settings& set) {
 
 int run(settings& set) {
   // The library's switches.
-  if (set.dry_run) ::setenv("LA_TEST", "1", 1);
+  if (set.dry_run || set.what == task::EXPLAIN) ::setenv("LA_TEST", "1", 1);
   if (set.detail) ::setenv("LAUNCHER_DETAIL", "1", 1);
   const console shown(set.debug);
   switch (set.what) {
@@ -158,6 +203,8 @@ int run(settings& set) {
       return ALL_FOUND;
     case task::RESOLVE:
       return resolve(set, shown);
+    case task::EXPLAIN:
+      return explain(set);
     default:
       return show_rules(set);
   }
@@ -166,7 +213,8 @@ int run(settings& set) {
 int run_command_line(int count, const char* const* words) {
   settings set;
   std::string wrong = read_command_line(count, words, set);
-  if (wrong.empty() && set.what == task::RESOLVE) wrong = complete(set);
+  const bool resolves = set.what == task::RESOLVE || set.what == task::EXPLAIN;
+  if (wrong.empty() && resolves) wrong = complete(set);
   if (!wrong.empty()) {
     complain(wrong);
     std::fputs("Try 'kestrel-launch --help'.\n", stderr);

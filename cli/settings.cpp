@@ -39,6 +39,8 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.dry_run = true; }},
     {"-d", "--detail", nullptr, "say why, and from where",
      [](settings& to, const char*) { to.detail = true; }},
+    {"-e", "--explain", nullptr, "tell what would be done for each name, and why; start nothing",
+     [](settings& to, const char*) { to.what = task::EXPLAIN; }},
     {nullptr, "--json", nullptr, "results as JSON, one object per line",
      [](settings& to, const char*) { to.json = true; }},
     {nullptr, "--check", nullptr, "load and check the rules, resolve nothing",
@@ -147,7 +149,8 @@ std::string read_command_line(int count, const char* const* words, settings& to)
   // The launcher counts both in 16 bits.
   if (to.search_dirs.size() > SHRT_MAX) return "there are too many search directories";
   if (to.libraries.size() > SHRT_MAX) return "there are too many library entries";
-  if (to.what == task::RESOLVE && to.names.empty() && to.names_files.empty()) {
+  const bool needs_names = to.what == task::RESOLVE || to.what == task::EXPLAIN;
+  if (needs_names && to.names.empty() && to.names_files.empty()) {
     return "no netlist is named";
   }
   return {};

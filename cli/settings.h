@@ -7,7 +7,7 @@
 #include <vector>
 
 /// What the command is to do.
-enum class task { RESOLVE, CHECK, LIST_RULES, GRAPH, HELP, VERSION };
+enum class task { RESOLVE, EXPLAIN, CHECK, LIST_RULES, GRAPH, HELP, VERSION };
 
 /// The settings of one call. The texts belong to the command line.
 struct settings {
