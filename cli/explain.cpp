@@ -79,7 +79,7 @@ std::string line_of(const LA_EXPLANATION::CONSIDERED& considered) {
       "not taken: what it needs is not there",
       "not taken: you named another file",
       "not taken: it is for netlists of another name",
-      "leads back to itself",
+      "leads into a loop",
       "not needed: a rule before it serves",
   };
   const LA_RULE& rule = *considered.rule;
@@ -141,6 +141,12 @@ std::string lines_of(const LA_EXPLANATION::STEP& step, int number) {
 }
 
 std::string answer(const outcome& found, const LA_EXPLANATION& why) {
+  for (const LA_EXPLANATION::CONSIDERED& considered : why.rules) {
+    if (considered.verdict == LA_EXPLANATION::IN_A_LOOP) {
+      return std::string("cannot be resolved: rule ") + considered.rule->rule_name.get() +
+             " leads into a loop";
+    }
+  }
   if (!found.error.empty()) return found.error.substr(0, found.error.size() - 1);
   if (found.result == LA_NOT_FOUND)
     return "not found: no file of this name, and none to make it from";
@@ -180,7 +186,8 @@ std::string duration(unsigned long long nanoseconds) {
 }
 
 std::string explained(const outcome& found, const LA_EXPLANATION& why) {
-  std::string text = found.name + ": " + answer(found, why) + "\n" + sightings(why.probes);
+  std::string text = found.name + ": " + answer(found, why) + "\n";
+  if (!why.probes.empty()) text += sightings(why.probes);
   std::string rules;
   for (const LA_EXPLANATION::CONSIDERED& considered : why.rules) {
     // One that was wanted more than once has one line.

@@ -14,12 +14,14 @@
 #include <exception>
 #include <fstream>
 #include <iostream>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "cli/console.h"
 #include "cli/explain.h"
 #include "cli/graph.h"
+#include "cli/hints.h"
 #include "cli/settings.h"
 #include "cli/signals.h"
 #include "host/port_file.h"
@@ -169,23 +171,45 @@ int explain(settings& set) {
   return status;
 }
 
-int show_rules(const settings& set) {
-  const LA_RULE_SET rules(set.part, set.user_rules);
-  if (rules.is_valid && rules.rules.count == 0) {
+/// Says so when there are no rules at all: the data of the installation is probably not found.
+void expect_rules(const LA_RULE_SET& set) {
+  if (set.is_valid && set.rules.count == 0) {
     complain("there are no rules; do MYCORVANE and CORVANE name installation roots?");
   }
-  if (rules.is_valid && set.what == task::LIST_RULES) {
-    const diversion to_output([](const Port_Msg& message) {
-      return message.level == PORT_MSG_STATUS && std::fputs(message.text, stdout) >= 0;
-    });
-    rules.dump(set.detail);
-  }
-  if (rules.is_valid && set.what == task::GRAPH) std::fputs(graph_of(rules.rules).c_str(), stdout);
-  if (set.what == task::CHECK) {
-    if (set.json) print_totals(rules.is_valid, 0, 0);
-    if (!set.json && rules.is_valid)
-      std::printf("Rules checked: %d, all good\n", rules.rules.count);
-  }
+}
+
+int check(const settings& set) {
+  std::vector<std::string> hints;
+  std::optional<diversion> reading([&hints](const Port_Msg& message) {
+    const std::string hint = hint_on(message.text);
+    const bool is_new = std::find(hints.begin(), hints.end(), hint) == hints.end();
+    if (!hint.empty() && is_new) hints.push_back(hint);
+    return false;
+  });
+  const LA_RULE_SET rules(set.part, set.user_rules);
+  reading.reset();
+  expect_rules(rules);
+  if (rules.is_valid) hints = hints_on(rules);
+  for (const std::string& hint : hints) complain("hint: " + hint);
+  if (set.json) print_totals(rules.is_valid, 0, 0);
+  if (!set.json && rules.is_valid) std::printf("Rules checked: %d, all good\n", rules.rules.count);
+  return rules.is_valid ? ALL_FOUND : FAILED;
+}
+
+int list_rules(const settings& set) {
+  const LA_RULE_SET rules(set.part, set.user_rules);
+  expect_rules(rules);
+  const diversion to_output([](const Port_Msg& message) {
+    return message.level == PORT_MSG_STATUS && std::fputs(message.text, stdout) >= 0;
+  });
+  if (rules.is_valid) rules.dump(set.detail);
+  return rules.is_valid ? ALL_FOUND : FAILED;
+}
+
+int draw_graph(const settings& set) {
+  const LA_RULE_SET rules(set.part, set.user_rules);
+  expect_rules(rules);
+  if (rules.is_valid) std::fputs(graph_of(rules).c_str(), stdout);
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
 
@@ -205,8 +229,12 @@ int run(settings& set) {
       return resolve(set, shown);
     case task::EXPLAIN:
       return explain(set);
+    case task::CHECK:
+      return check(set);
+    case task::LIST_RULES:
+      return list_rules(set);
     default:
-      return show_rules(set);
+      return draw_graph(set);
   }
 }
 

@@ -2,8 +2,9 @@
 
 #include <algorithm>
 #include <climits>
-#include <numeric>
 #include <string_view>
+
+#include "cli/nearest.h"
 
 namespace {
 
@@ -57,31 +58,11 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.what = task::VERSION; }},
 };
 
-/// How many characters must be changed, added or left out to make b of a.
-std::size_t distance(std::string_view a, std::string_view b) {
-  std::vector<std::size_t> row(b.size() + 1);
-  std::iota(row.begin(), row.end(), std::size_t(0));
-  for (std::size_t i = 0; i < a.size(); ++i) {
-    std::size_t diagonal = row[0]++;
-    for (std::size_t j = 0; j < b.size(); ++j) {
-      const std::size_t replaced = diagonal + (a[i] != b[j]);
-      diagonal = row[j + 1];
-      row[j + 1] = std::min({replaced, diagonal + 1, row[j] + 1});
-    }
-  }
-  return row.back();
-}
-
-std::string unknown_option(std::string_view name) {
-  const auto closer = [name](const option& a, const option& b) {
-    return distance(name, a.long_name) < distance(name, b.long_name);
-  };
-  const option& nearest = *std::min_element(std::begin(OPTIONS), std::end(OPTIONS), closer);
-  std::string text = "unknown option " + std::string(name);
-  if (distance(name, nearest.long_name) * 2 < name.size()) {
-    text += std::string("; did you mean ") + nearest.long_name + "?";
-  }
-  return text;
+std::string unknown_option(const std::string& name) {
+  std::vector<const char*> names;
+  for (const option& o : OPTIONS) names.push_back(o.long_name);
+  const std::string meant = nearest(name, names);
+  return "unknown option " + name + (meant.empty() ? "" : "; did you mean " + meant + "?");
 }
 
 /// One command line on its way into settings.

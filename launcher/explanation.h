@@ -38,7 +38,7 @@ struct LA_EXPLANATION {
     NO_SOURCE,          ///< what it needs is not there, and cannot be made
     NOT_WHAT_IS_NAMED,  ///< the user named a file, and it is not what the rule needs
     FOR_ANOTHER_NAME,   ///< the rule is for netlists of another name
-    IN_A_LOOP,          ///< it leads back to itself
+    IN_A_LOOP,          ///< it leads into a loop
     NOT_NEEDED,         ///< a rule before it serves
   };
   struct CONSIDERED {
