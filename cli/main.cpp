@@ -2,6 +2,7 @@
 //
 //   settings   reads the command line; holds the table of options
 //   console    shows messages and makes JSON
+//   completion completes command lines in a shell
 //   explain    tells why
 //   graph      draws the rules
 //   signals    ends the netlister when the command is to end
@@ -18,12 +19,14 @@
 #include <string>
 #include <vector>
 
+#include "cli/completion.h"
 #include "cli/console.h"
 #include "cli/explain.h"
 #include "cli/graph.h"
 #include "cli/hints.h"
 #include "cli/settings.h"
 #include "cli/signals.h"
+#include "host/pm_pic.h"
 #include "host/port_file.h"
 #include "host/port_interrupt.h"
 #include "launcher/baslauncher.h"
@@ -213,6 +216,18 @@ int draw_graph(const settings& set) {
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
 
+int list_parts() {
+  for (const std::string& part : PM_PIC::all_parts()) std::printf("%s\n", part.c_str());
+  return ALL_FOUND;
+}
+
+int print_completion(const std::string& shell) {
+  const std::string script = completion_for(shell);
+  if (script.empty()) complain("--completion: there is none for \"" + shell + "\"");
+  std::fputs(script.c_str(), stdout);
+  return script.empty() ? FAILED : ALL_FOUND;
+}
+
 int run(settings& set) {
   // The library's switches.
   if (set.dry_run || set.what == task::EXPLAIN) ::setenv("LA_TEST", "1", 1);
@@ -231,6 +246,10 @@ int run(settings& set) {
       return explain(set);
     case task::CHECK:
       return check(set);
+    case task::LIST_PARTS:
+      return list_parts();
+    case task::COMPLETION:
+      return print_completion(set.shell);
     case task::LIST_RULES:
       return list_rules(set);
     default:

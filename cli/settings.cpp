@@ -9,7 +9,7 @@
 namespace {
 
 constexpr option OPTIONS[] = {
-    {"-p", "--part", "NAME", "device part name",
+    {"-p", "--part", "PART", "device part name",
      [](settings& to, const char* text) { to.part = text; }},
     {"-sd", "--search-dir", "DIR", "search directory; may be repeated, searched in order",
      [](settings& to, const char* text) { to.search_dirs.push_back(text); }},
@@ -50,6 +50,13 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.what = task::LIST_RULES; }},
     {nullptr, "--graph", nullptr, "print the rules as a graph for Graphviz",
      [](settings& to, const char*) { to.what = task::GRAPH; }},
+    {nullptr, "--list-parts", nullptr, "print the device parts that are known",
+     [](settings& to, const char*) { to.what = task::LIST_PARTS; }},
+    {nullptr, "--completion", "SHELL", "print completions for a shell: bash or zsh",
+     [](settings& to, const char* text) {
+       to.what = task::COMPLETION;
+       to.shell = text;
+     }},
     {nullptr, "--debug", nullptr, "show debug traces",
      [](settings& to, const char*) { to.debug = true; }},
     {"-h", "--help", nullptr, "print this help",

@@ -120,7 +120,7 @@ TEST_F(Command, HelpsWithEveryOption) {
     EXPECT_LT(at, help.find(std::string("  ") + o.help + "\n", at)) << line;
   }
   EXPECT_EQ(run({KESTREL_LAUNCH, "e", "-h"}).out, help);
-  EXPECT_TRUE(run({KESTREL_LAUNCH, "-V"}).out.starts_with("kestrel-launch 0.9"));
+  EXPECT_TRUE(run({KESTREL_LAUNCH, "-V"}).out.starts_with("kestrel-launch 1.0.0"));
 }
 
 TEST_F(Command, FailsWhereItCannotWrite) {
