@@ -6,9 +6,10 @@ JOBS ?= $(shell nproc)
 BUILD_PACKAGES = g++ cmake make
 TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db
 DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
+PACKAGE_PACKAGES = $(BUILD_PACKAGES) dpkg-dev file
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo test sanitize lint clean help
+.PHONY: all build demo test sanitize lint package clean help
 
 all: build
 
@@ -43,6 +44,13 @@ lint:
 	@tools/setup $(LINT_PACKAGES) $(TEST_PACKAGES)
 	@tools/lint $(BUILD)
 
+# Debian packages of the command, the library, and what programs that use it are built with.
+package:
+	@tools/setup $(PACKAGE_PACKAGES)
+	@cmake -S . -B $(BUILD)-package -DCMAKE_BUILD_TYPE=Release -DCMAKE_INSTALL_PREFIX=/usr -DKESTREL_TESTS=OFF >/dev/null
+	@cmake --build $(BUILD)-package --parallel $(JOBS)
+	@cd $(BUILD)-package && cpack -G DEB >/dev/null && ls *.deb | sed 's|^|Made $(BUILD)-package/|'
+
 clean:
 	@rm -rf $(BUILD) $(BUILD)-*
 
@@ -52,4 +60,5 @@ help:
 	@echo "make test      set up, build, and pass all tests"
 	@echo "make sanitize  pass all tests under the sanitizers"
 	@echo "make lint      check format and code with clang's tools"
+	@echo "make package   make Debian packages"
 	@echo "make clean     remove what was built"

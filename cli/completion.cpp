@@ -14,7 +14,7 @@ struct argument_kind {
 };
 constexpr argument_kind KINDS[] = {
     // The launcher takes the names of parts in any case of letters.
-    {"PART", R"sh(-W "$("$1" --list-parts 2>/dev/null | tr A-Z a-z)" -- "${word,,}")sh",
+    {"PART", R"sh(-W "$(2>/dev/null "$1" --list-parts | tr A-Z a-z)" -- "${word,,}")sh",
      "_kestrel_launch_parts"},
     {"DIR", R"sh(-d -- "$word")sh", "_files -/"},
     {"FILE", R"sh(-f -- "$word")sh", "_files"},
@@ -73,7 +73,7 @@ std::string for_zsh() {
 # Completions of kestrel-launch for zsh.
 _kestrel_launch_parts() {
   local -a parts
-  parts=(${(f)"$(_call_program parts $words[1] --list-parts 2>/dev/null)"})
+  parts=(${(f)"$(2>/dev/null _call_program parts $words[1] --list-parts)"})
   compadd -M 'm:{a-zA-Z}={A-Za-z}' -a parts
 }
 _arguments \
