@@ -5,19 +5,17 @@
 //   plan LAYERS WIDTH TIMES DIRECTORY...       plans over rules between layers of extensions
 //   split acd|urf FILE                         reads a rules file, splits it into its fields
 //   spawn|fork MEGABYTES TIMES PROGRAM         starts a program over and over from a big process
-//   print MEGABYTES                            prints short lines
-//   read MEGABYTES                             splits into lines what a child prints
-//   run PROGRAM ARGUMENT...                    tells the memory that a program took
+//   print MEGABYTES                            prints lines of 32 bytes
+//   read MEGABYTES                             splits its input into lines
+//   run PROGRAM ARGUMENT...                    prints the kilobytes that a program took at most
 #include <fcntl.h>
 #include <spawn.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <climits>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "bench/measure.h"
 
@@ -26,34 +24,21 @@ namespace {
 /// The words of the command line from some word on.
 using words = char**;
 
-/// Time stamp of a file in nanoseconds, or -1.
-long time_of(const char* path) {
+/// Time stamp of the file of this name in nanoseconds, or -1.
+long time_of(std::string_view directory, std::string_view name, std::string_view ext) {
+  static std::string path;
+  path.assign(directory).append(name).append(ext);
   struct stat found = {};
-  if (::stat(path, &found) != 0 || S_ISDIR(found.st_mode)) return -1;
+  if (::stat(path.c_str(), &found) != 0 || S_ISDIR(found.st_mode)) return -1;
   return found.st_mtim.tv_sec * 1'000'000'000 + found.st_mtim.tv_nsec;
 }
 
-/// A path made of pieces, without a memory of its own to be allocated.
-struct path_buffer {
-  char chars[PATH_MAX];
-  std::size_t length = 0;
-
-  void add(std::string_view piece) {
-    std::memcpy(chars + length, piece.data(), piece.size());
-    length += piece.size();
-    chars[length] = '\0';
-  }
-  void cut(std::size_t new_length) { length = new_length; }
-};
-
 std::string content_of(const char* file) {
-  std::string content;
   const int descriptor = ::open(file, O_RDONLY);
   struct stat opened = {};
   require(descriptor >= 0 && ::fstat(descriptor, &opened) == 0, file);
-  content.resize(static_cast<std::size_t>(opened.st_size));
+  std::string content(static_cast<std::size_t>(opened.st_size), '\0');
   require(::read(descriptor, content.data(), content.size()) == opened.st_size, file);
-  ::close(descriptor);
   return content;
 }
 
@@ -68,31 +53,17 @@ void split(std::string_view text, char separator, Take take) {
 }
 
 void probe(words rest) {
-  const std::string names = content_of(*rest++);
-  const std::string_view output_dir = *rest++;
-  split(names, '\n', [&](std::string_view name) {
-    long source = -1;
-    for (words dir = rest; *dir != nullptr; ++dir) {
-      path_buffer path;
-      path.add(*dir);
-      path.add(name);
-      path.add(".a");
-      const long time = time_of(path.chars);
-      if (source < 0) source = time;
+  split(content_of(rest[0]), '\n', [rest](std::string_view name) {
+    long before = -1;
+    for (words dir = rest + 2; *dir != nullptr; ++dir) {
+      before = std::max(before, time_of(*dir, name, ".a"));
     }
-    path_buffer output;
-    output.add(output_dir);
-    output.add(name);
-    const std::size_t root = output.length;
-    long before = source;
     for (const char* ext : {".b", ".c", ".kbo"}) {
-      output.cut(root);
-      output.add(ext);
-      const long time = time_of(output.chars);
+      const long time = time_of(rest[1], name, ext);
       require(before >= 0 && time >= before, "a chain is not up to date");
       before = time;
     }
-    std::puts(output.chars);
+    std::printf("%s%.*s.kbo\n", rest[1], static_cast<int>(name.size()), name.data());
   });
 }
 
@@ -102,46 +73,41 @@ void probe(words rest) {
 class planner {
  public:
   planner(int layers, int width, words dirs) : dirs_(dirs) {
-    const int wanted = layers * width + width;
-    producers_.resize(static_cast<std::size_t>(wanted) + 1);
     for (int layer = 0; layer <= layers; ++layer) {
-      for (int from = 0; from < width; ++from) {
-        names_.push_back(".e" + std::to_string(layer) + "_" + std::to_string(from));
-        for (int to = 0; to < (layer < layers ? width : 1); ++to) {
-          const int made = layer < layers ? (layer + 1) * width + to : wanted;
-          producers_[static_cast<std::size_t>(made)].push_back(layer * width + from);
+      for (int i = 0; i < width; ++i) {
+        names_.push_back(".e" + std::to_string(layer) + "_" + std::to_string(i));
+        producers_.emplace_back();
+        for (int from = 0; layer > 0 && from < width; ++from) {
+          producers_.back().push_back((layer - 1) * width + from);
         }
       }
     }
+    producers_.emplace_back();
+    for (int from = 0; from < width; ++from) producers_.back().push_back(layers * width + from);
   }
 
   bool plan() {
     failed_.assign(names_.size(), false);
     chain_.clear();
-    return make(static_cast<int>(names_.size())) || exists(".kbo") || exists(".kbc");
+    return make(names_.size()) || exists(".kbo") || exists(".kbc");
   }
 
  private:
-  bool make(int wanted) {
-    for (const int needed : producers_[static_cast<std::size_t>(wanted)]) {
+  bool make(std::size_t wanted) {
+    for (const int needed : producers_[wanted]) {
       const auto i = static_cast<std::size_t>(needed);
       if (failed_[i]) continue;
       chain_.push_back(needed);
-      if (make(needed) || exists(names_[i])) return true;
+      if (make(i) || exists(names_[i])) return true;
       chain_.pop_back();
       failed_[i] = true;
     }
     return false;
   }
   bool exists(std::string_view ext) const {
-    for (words dir = dirs_; *dir != nullptr; ++dir) {
-      path_buffer path;
-      path.add(*dir);
-      path.add("top");
-      path.add(ext);
-      if (time_of(path.chars) >= 0) return true;
-    }
-    return false;
+    words dir = dirs_;
+    while (*dir != nullptr && time_of(*dir, "top", ext) < 0) ++dir;
+    return *dir != nullptr;
   }
 
   words dirs_;
@@ -156,91 +122,63 @@ void plan(words rest) {
   measure(std::atoi(rest[2]), [&rules] { rules.plan(); });
 }
 
-std::string_view trimmed(std::string_view text) {
-  const std::size_t start = text.find_first_not_of(" \t");
-  if (start == text.npos) return {};
-  return text.substr(start, text.find_last_not_of(" \t") - start + 1);
-}
-
 /// A data file has a key and fields on a line, a user rules file keywords and values.
 void split_rules(words rest) {
   const bool is_data = std::string_view(rest[0]) == "acd";
-  std::vector<std::string_view> fields;
+  std::size_t fields = 0;
+  std::size_t bytes = 0;
+  const auto take = [&](std::string_view field) {
+    while (!field.empty() && field.front() == ' ') field.remove_prefix(1);
+    while (!field.empty() && field.back() == ' ') field.remove_suffix(1);
+    ++fields;
+    bytes += field.size();
+  };
   measure(1, [&] {
-    static std::string content;
-    content = content_of(rest[1]);
-    split(content, is_data ? '\n' : ';', [&](std::string_view record) {
+    split(content_of(rest[1]), is_data ? '\n' : ';', [&](std::string_view record) {
       const std::size_t equals = std::min(record.find('='), record.size() - 1);
-      fields.push_back(trimmed(record.substr(0, equals)));
-      const std::string_view value = record.substr(equals + 1);
-      if (!is_data) fields.push_back(trimmed(value));
-      if (is_data) split(value, ',', [&](std::string_view f) { fields.push_back(trimmed(f)); });
+      take(record.substr(0, equals));
+      split(record.substr(equals + 1), is_data ? ',' : '\n', take);
     });
   });
-  require(fields.size() > 100, "there are no fields");
+  require(fields > 100 && bytes > fields, "there are no fields");
 }
 
-void wait_for(pid_t child) {
-  int status = 0;
-  require(::waitpid(child, &status, 0) == child && status == 0, "a child failed");
-}
-
-pid_t start(words command, const posix_spawn_file_actions_t* actions) {
+void spawn(words command) {
   pid_t child = 0;
-  require(::posix_spawnp(&child, *command, actions, nullptr, command, environ) == 0, *command);
-  return child;
+  require(::posix_spawnp(&child, *command, nullptr, nullptr, command, environ) == 0, *command);
 }
 
-void start_often(words rest, bool by_fork) {
-  grow(std::atoi(rest[0]));
-  measure(std::atoi(rest[1]), [&] {
-    const pid_t child = by_fork ? ::fork() : start(rest + 2, nullptr);
-    if (by_fork && child == 0) {
-      ::execvp(rest[2], rest + 2);
-      ::_exit(127);
-    }
-    wait_for(child);
-  });
+void spawn_by_fork(words command) {
+  if (::fork() != 0) return;
+  ::execvp(*command, command);
+  ::_exit(127);
 }
 
-void print_lines(words rest) {
+void run(void (*start)(words), words command) {
+  int status = 0;
+  start(command);
+  require(::wait(&status) > 0 && status == 0, *command);
+}
+
+void print_lines(int megabytes) {
   static char block[65536];
   for (std::size_t at = 0; at < sizeof block; ++at) block[at] = at % 32 == 31 ? '\n' : 'x';
-  for (int blocks = std::atoi(rest[0]) * 16; blocks > 0; --blocks) {
-    for (std::size_t done = 0; done < sizeof block;) {
-      const ssize_t length = ::write(STDOUT_FILENO, block + done, sizeof block - done);
-      if (length <= 0) std::exit(1);
-      done += static_cast<std::size_t>(length);
-    }
+  for (long left = megabytes * 1048576L; left > 0;) {
+    const ssize_t length = ::write(STDOUT_FILENO, block + (-left & 31), sizeof block / 2);
+    require(length > 0, "nobody reads");
+    left -= length;
   }
 }
 
-void read_lines(words rest, const char* self) {
+void read_lines(long megabytes) {
   long lines = 0;
-  measure(1, [&] {
-    int ends[2];
-    require(::pipe2(ends, O_CLOEXEC) == 0, "no pipe");
-    posix_spawn_file_actions_t actions;
-    ::posix_spawn_file_actions_init(&actions);
-    ::posix_spawn_file_actions_adddup2(&actions, ends[1], STDOUT_FILENO);
-    std::string command[] = {self, "print", rest[0]};
-    char* arguments[] = {command[0].data(), command[1].data(), command[2].data(), nullptr};
-    const pid_t child = start(arguments, &actions);
-    ::close(ends[1]);
+  measure(1, [&lines] {
     static char block[65536];
-    for (ssize_t length = 0; (length = ::read(ends[0], block, sizeof block)) > 0;) {
+    for (ssize_t length = 0; (length = ::read(STDIN_FILENO, block, sizeof block)) > 0;) {
       split({block, static_cast<std::size_t>(length)}, '\n', [&](std::string_view) { ++lines; });
     }
-    wait_for(child);
   });
-  require(lines >= std::atoi(rest[0]) * 32768L, "lines are missing");
-}
-
-void run_program(words command) {
-  wait_for(start(command, nullptr));
-  rusage used = {};
-  ::getrusage(RUSAGE_CHILDREN, &used);
-  std::fprintf(stderr, "\nkilobytes %ld\n", used.ru_maxrss);
+  require(lines >= megabytes * 32768, "lines are missing");
 }
 
 }  // namespace
@@ -248,12 +186,21 @@ void run_program(words command) {
 int main(int count, char** arguments) {
   require(count > 2, "floor: what?");
   const std::string_view what = arguments[1];
-  const words rest = arguments + 2;
+  words rest = arguments + 2;
+  const int number = std::atoi(rest[0]);
   if (what == "probe") probe(rest);
   if (what == "plan") plan(rest);
   if (what == "split") split_rules(rest);
-  if (what == "spawn" || what == "fork") start_often(rest, what == "fork");
-  if (what == "print") print_lines(rest);
-  if (what == "read") read_lines(rest, arguments[0]);
-  if (what == "run") run_program(rest);
+  if (what == "print") print_lines(number);
+  if (what == "read") read_lines(number);
+  if (what == "spawn" || what == "fork") {
+    grow(number);
+    measure(std::atoi(rest[1]), [&] { run(what == "fork" ? spawn_by_fork : spawn, rest + 2); });
+  }
+  if (what == "run") {
+    run(spawn, rest);
+    rusage used = {};
+    ::getrusage(RUSAGE_CHILDREN, &used);
+    std::fprintf(stderr, "\n%ld\n", used.ru_maxrss);
+  }
 }

@@ -1,13 +1,11 @@
 // A host program of the library, for the workloads that are measured inside a process.
 //
-//   plan TIMES DIRECTORY...     plans for the name "top"; the output directory is out/
-//   load [FILE]                 loads the rules
-//   spawn MEGABYTES TIMES       starts the netlister of "top" over and over from a big process
-//   output                      runs the netlister of "top", counts the lines that it prints
-//   expand WAY TIMES            expands a template, by the library or as others would
+//   find MEGABYTES TIMES force|decide DIRECTORY...   resolves "top" over and over in a big process
+//   load [FILE]                                      loads the rules
+//   expand WAY TIMES                                 expands a template, by the library or
+//   otherwise
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "bench/measure.h"
 #include "host/port_msgman.h"
@@ -18,53 +16,35 @@ namespace {
 
 using words = char**;
 
-long messages = 0;
-long message_bytes = 0;
-
-void count_message(void* /*context*/, const Port_Msg& message) {
+/// Drops messages, but for errors.
+void show_error(void* /*context*/, const Port_Msg& message) {
   if (message.level == PORT_MSG_ERROR) std::fputs(message.text, stderr);
-  ++messages;
-  message_bytes += static_cast<long>(std::strlen(message.text));
 }
 
 /// A launcher without part, libraries and switches.
 struct plain_launcher : LA_LAUNCHER {
-  plain_launcher(const char** dirs, std::size_t num_dirs, const char* rules, bool force)
-      : LA_LAUNCHER(nullptr, dirs, static_cast<short>(num_dirs), nullptr, 0, "out", rules, force, 0,
-                    0, 0, 0, 0) {
+  plain_launcher(std::vector<const char*> dirs, const char* rules, bool force)
+      : LA_LAUNCHER(nullptr, dirs.data(), static_cast<short>(dirs.size()), nullptr, 0, "out", rules,
+                    force, 0, 0, 0, 0, 0) {
     require(ok, "the rules are not valid");
-  }
-  short find_top() {
-    char source[LA_MAX_PATH];
-    char netlist[LA_MAX_PATH];
-    return find("top", source, netlist, 1);
   }
 };
 
-void plan(words rest) {
-  std::vector<const char*> dirs;
-  for (words dir = rest + 1; *dir != nullptr; ++dir) dirs.push_back(*dir);
-  plain_launcher launcher(dirs.data(), dirs.size(), nullptr, false);
-  measure(std::atoi(rest[0]), [&launcher] { launcher.find_top(); });
-  require(launcher.errors == 0, "planning failed");
+void find(words rest, std::size_t count) {
+  grow(std::atoi(rest[0]));
+  plain_launcher launcher({rest + 3, rest + count}, nullptr, std::string_view(rest[2]) == "force");
+  measure(std::atoi(rest[1]), [&launcher] {
+    char source[LA_MAX_PATH];
+    char netlist[LA_MAX_PATH];
+    launcher.find("top", source, netlist, 1);
+  });
+  require(launcher.errors == 0, "there were errors");
 }
 
+/// The rules stay until the process ends: what their end costs is not measured.
 void load(words rest) {
   alignas(plain_launcher) static char launcher[sizeof(plain_launcher)];
-  measure(1, [&] { new (launcher) plain_launcher(nullptr, 0, *rest, false); });
-}
-
-void spawn(words rest) {
-  grow(std::atoi(rest[0]));
-  plain_launcher launcher(nullptr, 0, nullptr, true);
-  measure(std::atoi(rest[1]), [&launcher] { launcher.find_top(); });
-  require(launcher.errors == 0, "a start failed");
-}
-
-void output() {
-  plain_launcher launcher(nullptr, 0, nullptr, true);
-  measure(1, [&launcher] { launcher.find_top(); });
-  require(messages > 32768, "lines are missing");
+  measure(1, [&] { new (launcher) plain_launcher({}, *rest, false); });
 }
 
 // ---- Templates ----
@@ -72,23 +52,21 @@ void output() {
 constexpr char TEMPLATE[] =
     "-p $part [-family $family] [-dev $device] [-pkg $pkg] [-speed $speed] {-l $libraries }"
     "[$ignore_locs] [$add_pads] [$quiet] [$aul] '-dir=$OUTPUT' -o $outfile -i $infile";
-constexpr const char* KEYWORDS[] = {"part",    "family",      "device",   "pkg",   "speed",
-                                    "OUTPUT",  "ignore_locs", "add_pads", "quiet", "aul",
-                                    "outfile", "infile",      "libraries"};
-constexpr const char* VALUES[] = {"hx8k-ct256-10",
-                                  "ice40",
-                                  "hx8k",
-                                  "ct256",
-                                  "10",
-                                  "/home/user/work/projects/board-rev/out/",
-                                  "-r",
-                                  "-a",
-                                  "-quiet",
-                                  "-aul",
-                                  "\"../out/receiver.kbo\"",
-                                  "\"receiver.blif\"",
-                                  "/home/user/libraries/cells"};
-constexpr std::size_t NUM_KEYWORDS = std::size(KEYWORDS);
+/// Each followed by its value.
+constexpr const char* KEYWORDS[] = {"part",        "hx8k-ct256-10",
+                                    "family",      "ice40",
+                                    "device",      "hx8k",
+                                    "pkg",         "ct256",
+                                    "speed",       "10",
+                                    "OUTPUT",      "/home/user/work/projects/board-rev/out/",
+                                    "ignore_locs", "-r",
+                                    "add_pads",    "-a",
+                                    "quiet",       "-quiet",
+                                    "aul",         "-aul",
+                                    "outfile",     "\"../out/receiver.kbo\"",
+                                    "infile",      "\"receiver.blif\"",
+                                    "libraries",   "/home/user/libraries/cells"};
+constexpr std::size_t NUM_KEYWORDS = std::size(KEYWORDS) / 2;
 
 /// The values as the ways to expand get them: the compiler knows nothing of them.
 const char* values[NUM_KEYWORDS];
@@ -130,24 +108,22 @@ void by_snprintf() {
 
 /// All groups stay, so that nothing has to be known of them.
 void by_replacing() {
-  std::string text;
-  for (const char c : TEMPLATE) {
-    if (std::string_view("[]{}").find(c) == std::string_view::npos) text += c;
-  }
+  std::string text = TEMPLATE;
+  std::erase_if(text, [](char c) { return std::strchr("[]{}", c) != nullptr; });
   for (std::size_t i = 0; i < NUM_KEYWORDS; ++i) {
-    const std::string reference = std::string("$") + KEYWORDS[i];
+    const std::string reference = std::string("$") + KEYWORDS[2 * i];
     for (std::size_t at = text.find(reference); at != text.npos; at = text.find(reference, at)) {
       text.replace(at, reference.size(), values[i]);
     }
   }
-  std::memcpy(expanded, text.data(), text.size());
+  std::memcpy(expanded, text.c_str(), text.size() + 1);
 }
 
 void expand(std::string_view way, int times) {
   LA_KEYWORD_TABLE table;
   for (std::size_t i = 0; i < NUM_KEYWORDS; ++i) {
-    table.set_keyword(KEYWORDS[i], VALUES[i]);
-    values[i] = VALUES[i];
+    table.set_keyword(KEYWORDS[2 * i], KEYWORDS[2 * i + 1]);
+    values[i] = KEYWORDS[2 * i + 1];
     asm volatile("" : : "r"(values) : "memory");
   }
   by_library(table);
@@ -165,12 +141,10 @@ void expand(std::string_view way, int times) {
 
 int main(int count, char** arguments) {
   require(count > 1, "host: what?");
-  Port_MsgManData::setSink({count_message, nullptr, false});
+  Port_MsgManData::setSink({show_error, nullptr, false});
   const std::string_view what = arguments[1];
-  const words rest = arguments + 2;
-  if (what == "plan") plan(rest);
+  words rest = arguments + 2;
+  if (what == "find") find(rest, static_cast<std::size_t>(count) - 2);
   if (what == "load") load(rest);
-  if (what == "spawn") spawn(rest);
-  if (what == "output") output();
   if (what == "expand") expand(rest[0], std::atoi(rest[1]));
 }

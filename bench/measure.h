@@ -9,6 +9,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <vector>
 
 /// Nanoseconds of processor time of this process, or of its children that it has waited for.
 inline double processor_time(int who) {
@@ -44,10 +45,8 @@ void measure(int times, Work work) {
 
 /// Makes the process as big as a host of so many megabytes, all of them in use.
 inline void grow(int megabytes) {
-  const std::size_t size = static_cast<std::size_t>(megabytes) << 20;
-  char* memory = static_cast<char*>(std::malloc(size));
-  // Written through a volatile pointer, as nobody reads it.
-  for (std::size_t at = 0; at < size; at += 4096) static_cast<volatile char*>(memory)[at] = 1;
+  static std::vector<char> memory;
+  memory.assign(static_cast<std::size_t>(megabytes) << 20, 1);
 }
 
 /// Ends the program when something that the bench takes for granted does not hold.
