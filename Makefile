@@ -1,5 +1,6 @@
 # make demo    set up, build, resolve the examples
 # make test    set up, build, pass all tests
+# make bench   set up, build, measure; make bench ROWS="1 3" QUICK=1
 BUILD ?= build
 JOBS ?= $(shell nproc)
 
@@ -7,9 +8,10 @@ BUILD_PACKAGES = g++ cmake make
 TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db
 DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
 PACKAGE_PACKAGES = $(BUILD_PACKAGES) dpkg-dev file
+BENCH_PACKAGES = $(BUILD_PACKAGES) ninja-build python3 strace valgrind
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo test sanitize lint package clean help
+.PHONY: all build demo test bench sanitize lint package clean help
 
 all: build
 
@@ -30,6 +32,13 @@ test:
 	@cmake --build $(BUILD) --parallel $(JOBS)
 	@cd $(BUILD) && ctest --output-on-failure --parallel $(JOBS)
 	@echo "All tests passed, of $(BUILD)/bin/kestrel-launch and its library."
+
+# Some eight minutes, on a machine with nothing else to do.
+bench:
+	@tools/setup $(BENCH_PACKAGES)
+	@cmake -S . -B $(BUILD) -DCMAKE_BUILD_TYPE=Release -DKESTREL_TESTS=OFF -DKESTREL_BENCH=ON >/dev/null
+	@cmake --build $(BUILD) --parallel $(JOBS) --target bench
+	@bench/run --bin $(BUILD)/bin $(if $(QUICK),--quick) $(ROWS)
 
 # The tests again, under AddressSanitizer (with its leak check) and UndefinedBehaviorSanitizer.
 sanitize:
@@ -58,6 +67,7 @@ help:
 	@echo "make           build the library and the command"
 	@echo "make demo      set up, build, and resolve the examples"
 	@echo "make test      set up, build, and pass all tests"
+	@echo "make bench     measure the launcher beside make and ninja; ROWS=\"1 3\" QUICK=1"
 	@echo "make sanitize  pass all tests under the sanitizers"
 	@echo "make lint      check format and code with clang's tools"
 	@echo "make package   make Debian packages"
