@@ -5,7 +5,7 @@ BUILD ?= build
 JOBS ?= $(shell nproc)
 
 BUILD_PACKAGES = g++ cmake make
-TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db
+TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db pkgconf
 DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
 PACKAGE_PACKAGES = $(BUILD_PACKAGES) dpkg-dev file
 BENCH_PACKAGES = $(BUILD_PACKAGES) ninja-build python3 strace valgrind
