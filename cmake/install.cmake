@@ -37,7 +37,8 @@ install(EXPORT KestrelLauncher NAMESPACE KestrelLauncher:: FILE KestrelLauncherC
 write_basic_package_version_file(KestrelLauncherConfigVersion.cmake COMPATIBILITY SameMajorVersion)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/KestrelLauncherConfigVersion.cmake
   DESTINATION ${KESTREL_CMAKE_DIR} COMPONENT development)
-file(RELATIVE_PATH KESTREL_PREFIX /${CMAKE_INSTALL_LIBDIR}/pkgconfig /.)
+file(RELATIVE_PATH KESTREL_PREFIX /${CMAKE_INSTALL_LIBDIR}/pkgconfig /)
+string(REGEX REPLACE "/$" "" KESTREL_PREFIX "${KESTREL_PREFIX}")
 configure_file(cmake/kestrel-launcher.pc.in kestrel-launcher.pc @ONLY)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/kestrel-launcher.pc
   DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)
