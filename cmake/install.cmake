@@ -17,6 +17,8 @@ set(KESTREL_CMAKE_DIR ${CMAKE_INSTALL_LIBDIR}/cmake/KestrelLauncher)
 # The command, its data and its manual.
 install(TARGETS kestrel-launch COMPONENT command)
 install(DIRECTORY data DESTINATION ${CMAKE_INSTALL_DATADIR}/kestrel-launcher COMPONENT command)
+install(FILES docs/json-output.schema.json
+  DESTINATION ${CMAKE_INSTALL_DATADIR}/kestrel-launcher COMPONENT command)
 install(FILES docs/kestrel-launch.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT command)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/completion.bash RENAME kestrel-launch
   DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT command)
