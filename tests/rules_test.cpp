@@ -142,7 +142,7 @@ TEST_F(Rules, UserFileNames) {
   expect_table([this](const std::string& name) { return loaded(nullptr, name.c_str()); }, R"(
 u     | r@;
 a.txt | r@;
-d     | User rules file "~/d.urf" does not exist.\n(0)
+d     | Could not open user rules file "d".\n(0)
 p     | Could not open user rules file "p".\n(0))");
   const std::string name(260, 'x');
   EXPECT_EQ(loaded(nullptr, name.c_str()).find(name + "\" is longer than 259 characters"), 22);
