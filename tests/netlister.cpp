@@ -4,7 +4,6 @@
 //   dir         writes the current directory
 //   out=FILE    writes FILE; its content is the arguments of the call
 //   exit=N      ends with exit code N; kill=N ends by signal N
-//   leave=N     leaves a process behind that holds the output open for N seconds
 //   close       closes standard output and error
 //   sleep=N     sleeps for N milliseconds
 // Any other argument does nothing.
@@ -30,12 +29,6 @@ void write_to(int descriptor, const std::string& text) {
   if (::write(descriptor, text.data(), text.size()) < 0) std::exit(99);
 }
 
-void leave_behind(unsigned int seconds) {
-  if (::fork() != 0) return;
-  ::sleep(seconds);
-  ::_exit(0);
-}
-
 void carry_out(const std::string& verb, const std::string& value,
                const std::vector<std::string>& words) {
   const int number = std::atoi(value.c_str());
@@ -46,7 +39,6 @@ void carry_out(const std::string& verb, const std::string& value,
   if (verb == "out") std::ofstream(value) << all(words);
   if (verb == "exit") std::exit(number);
   if (verb == "kill") ::raise(number);
-  if (verb == "leave") leave_behind(static_cast<unsigned int>(number));
   if (verb == "close") ::close(1), ::close(2);
   if (verb == "sleep") ::usleep(static_cast<useconds_t>(number) * 1000);
 }

@@ -70,7 +70,8 @@ class Tree {
   std::string expand(std::string text) const;
   /// text with every occurrence of the tree's directory replaced by "~".
   std::string shorten(std::string text) const;
-  /// Runs shell commands, with the command that is tested on PATH. Tells what they print, shortened.
+  /// Runs shell commands, with the command that is tested on PATH. Tells what they print,
+  /// shortened.
   std::string shell(const std::string& commands) const;
 
   std::string home;
