@@ -2,10 +2,16 @@
 #ifndef KESTREL_LAUNCHER_COMMAND_OPTIONS_H
 #define KESTREL_LAUNCHER_COMMAND_OPTIONS_H
 
+#include <array>
 #include <string>
 #include <vector>
 
 #include "optparse/baslaoptparse.h"
+
+/// The keywords that a launcher defines.
+inline constexpr std::array LA_OPTION_KEYWORDS = {
+    "part",        "family",   "device", "pkg", "speed",  "infile",   "outfile",
+    "ignore_locs", "add_pads", "quiet",  "aul", "OUTPUT", "libraries"};
 
 /// The keywords of a chain. Those whose values are names of files or directories are kept twice:
 /// as they are, and as stand-ins, which mean nothing in a command line. A template expanded with

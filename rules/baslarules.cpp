@@ -428,6 +428,14 @@ constexpr short NUM_FIELDS = std::size(FIELDS);
 
 }  // namespace
 
+std::vector<const char*> rule_keywords() {
+  std::vector<const char*> keywords = {"RuleName"};
+  for (const rule_field& field : FIELDS) {
+    if (field.store != nullptr) keywords.push_back(field.keyword);
+  }
+  return keywords;
+}
+
 // ---- User rules file ----
 
 namespace {
@@ -561,6 +569,7 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
   user_rules_loader loader(file_name, *stream);
   const bool good = loader.read() && loader.validate();
   loader.move_to(rules);
+  add_file(file.get_fullfile());
   return good;
 }
 
@@ -702,7 +711,15 @@ bool LA_RULE_SET::load_system_rules(const char* part_name) {
   system_rules_loader loader(path.c_str());
   if (!loader.read() || !loader.validate()) return false;
   loader.move_to(rules);
+  add_file(path);
   return true;
+}
+
+/// The rules that no file before has are those of this one.
+void LA_RULE_SET::add_file(const std::string& path) {
+  int num_before = 0;
+  for (const LA_RULES_FILE& file : files) num_before += file.num_rules;
+  files.push_back({path, rules.count - num_before});
 }
 
 // ---- Rule set ----
