@@ -91,6 +91,11 @@ bool File::exist(const char* path) {
   return status(path).exists;
 }
 
+bool File::missing(const char* path) {
+  struct stat found = {};
+  return ::lstat(path, &found) != 0 && (errno == ENOENT || errno == ENOTDIR);
+}
+
 bool File::isdirectory(const char* path) {
   struct stat found = {};
   return ::stat(path, &found) == 0 && S_ISDIR(found.st_mode);

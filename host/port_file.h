@@ -65,6 +65,8 @@ class File {
   static FileStatus status(const char* path);
   /// True when there is anything but a directory at path.
   static bool exist(const char* path);
+  /// True when nothing is at path: no file, no directory, no link, and nothing that rights hide.
+  static bool missing(const char* path);
   /// True when path is a directory.
   static bool isdirectory(const char* path);
   /// Sets time to the modification time of path, in nanoseconds since 1970. Returns false, and

@@ -549,17 +549,19 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
   const char* full_name = file.get_fullfile();
   if (full_name == nullptr && file.get_name() != nullptr) {
     message().issueError(
-        "Launcher: User rules file \"%s\" has no full name of at most %d characters.\n", file_name,
-        LA_MAX_PATH - 1);
+        "Launcher: User rules file \"%s\" has no full name of at most %d characters, or the "
+        "current "
+        "directory cannot be used.\n",
+        file_name, LA_MAX_PATH - 1);
     return false;
   }
-  if (!file.exists()) {
+  if (full_name == nullptr || Port::File::missing(full_name)) {
     message().issueError("Launcher: User rules file \"%s\" does not exist.\n",
                          full_name != nullptr ? full_name : file_name);
     return false;
   }
   std::unique_ptr<Port::Stream, close_stream> stream(
-      Port::File::open(file.get_fullfile(), Port::Stream::READ, true));
+      Port::File::open(full_name, Port::Stream::READ, true));
   if (!stream) {
     message().issueError("Launcher: Could not open user rules file \"%s\".\n", file_name);
     return false;

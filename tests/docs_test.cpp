@@ -2,8 +2,6 @@
 // the man page names exactly the options that there are.
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <iterator>
 #include <regex>
 #include <sstream>
 #include <utility>
@@ -15,8 +13,7 @@
 namespace {
 
 std::string guide(const std::string& name) {
-  std::ifstream in(KESTREL_SOURCE_DIR "/docs/" + name);
-  return {std::istreambuf_iterator<char>(in), {}};
+  return slurp(KESTREL_SOURCE_DIR "/docs/" + name);
 }
 
 /// Runs the samples of a guide one after the other; each finds what those before it have left.
@@ -33,14 +30,14 @@ struct Samples {
     std::istringstream lines(kind == "messages" ? "" : text);
     for (std::string line; std::getline(lines, line);) {
       if (kind == "templates") result += expand(line);
-      if (kind == "console" && line[0] == '$') result += line + "\n" + output_of(line.substr(1));
+      if (kind == "console" && line[0] == '$') result += line + "\n" + tree.shell(line.substr(1));
     }
     return result;
   }
   std::string load(const std::string& path, const std::string& kind, const std::string& text) {
     const std::string before = tree.read(path);
     tree.write(path, text);
-    findings = output_of("kestrel-launch --check -u sample.urf 2>&1 >/dev/null | grep -v hint:");
+    findings = tree.shell("kestrel-launch --check -u sample.urf 2>&1 >/dev/null | grep -v hint:");
     EXPECT_EQ(!findings.empty(), kind.ends_with("-error")) << text;
     if (!findings.empty()) tree.write(path, before);
     return text;
@@ -58,9 +55,6 @@ struct Samples {
     line.copy(options, line.rfind('"', arrow) - 1, 1);
     if (table.expand(options)) return line.substr(0, arrow + 4) + "\"" + options + "\"\n";
     return line.substr(0, arrow + 4) + "error: " + messages.take().erase(0, 2);
-  }
-  std::string output_of(const std::string& line) const {
-    return tree.shorten(run({"sh", "-c", "exec 2>&1; PATH=" KESTREL_BIN_DIR ":$PATH;" + line}).out);
   }
 
   Tree tree;

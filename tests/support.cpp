@@ -28,12 +28,12 @@ void record(void* self, const Port_Msg& m) {
   static_cast<Messages*>(self)->records.push_back({m.level, origin, m.text});
 }
 
+}  // namespace
+
 std::string slurp(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   return {std::istreambuf_iterator<char>(in), {}};
 }
-
-}  // namespace
 
 std::string replaced(std::string text, const std::string& from, const std::string& to) {
   for (std::size_t at = text.find(from); at != text.npos; at = text.find(from, at + to.size())) {
@@ -112,6 +112,10 @@ std::string Tree::expand(std::string text) const {
 
 std::string Tree::shorten(std::string text) const {
   return replaced(std::move(text), home, "~");
+}
+
+std::string Tree::shell(const std::string& commands) const {
+  return shorten(run({"sh", "-c", "exec 2>&1; PATH=" KESTREL_BIN_DIR ":$PATH;" + commands}).out);
 }
 
 Ran run(const std::vector<std::string>& words, const std::string& input,

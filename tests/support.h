@@ -70,6 +70,9 @@ class Tree {
   std::string expand(std::string text) const;
   /// text with every occurrence of the tree's directory replaced by "~".
   std::string shorten(std::string text) const;
+  /// Runs shell commands, with the command that is tested on PATH. Tells what they print,
+  /// shortened.
+  std::string shell(const std::string& commands) const;
 
   std::string home;
 
@@ -90,6 +93,8 @@ struct Ran {
 Ran run(const std::vector<std::string>& words, const std::string& input = "",
         const std::function<void(pid_t)>& meanwhile = [](pid_t) {});
 
+/// The content of a file.
+std::string slurp(const std::string& path);
 /// text with every occurrence of from replaced by to.
 std::string replaced(std::string text, const std::string& from, const std::string& to);
 
