@@ -58,6 +58,21 @@ struct FileStatus {
   __int64 time = 0;     ///< modification time, in nanoseconds since 1970; 0 when there is none
 };
 
+/// The directory that is current when this is made, by whatever name it goes later.
+class Place {
+ public:
+  Place();
+  Place(const Place&) = delete;
+  Place& operator=(const Place&) = delete;
+  ~Place();
+
+  /// Makes it the current directory again. Returns false when that fails.
+  bool enter() const;
+
+ private:
+  int descriptor_;
+};
+
 /// The files of the process, by their names in either form.
 class File {
  public:

@@ -413,19 +413,20 @@ class LA_LAUNCHER::working_directory {
   working_directory(const working_directory&) = delete;
   working_directory& operator=(const working_directory&) = delete;
   ~working_directory() {
-    if (left_) home_.chdir();
+    // A netlister may have moved or removed the directory of that name.
+    if (left_ && !left_->enter()) home_.chdir();
   }
 
   /// The directory that was current when the chain started.
   const LA_DIR& home() const { return home_; }
   void enter(const LA_DIR& directory) {
-    left_ = true;
+    if (!left_) left_.emplace();
     directory.chdir();
   }
 
  private:
   const LA_DIR home_;
-  bool left_ = false;
+  std::optional<Port::Place> left_;
 };
 
 short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
