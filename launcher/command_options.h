@@ -3,6 +3,7 @@
 #define KESTREL_LAUNCHER_COMMAND_OPTIONS_H
 
 #include <array>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -34,12 +35,13 @@ class la_command_options {
                            const std::string& command) const;
 
  private:
-  std::string stand_in_for(const std::string& name);
+  std::string stand_in_for(const std::string& name, std::size_t number);
   std::string with_names(std::string word) const;
 
   LA_KEYWORD_TABLE real_;
   LA_KEYWORD_TABLE plain_;
-  std::vector<std::string> names_;  ///< by the number in their stand-in
+  std::vector<std::string> names_;              ///< by the number in their stand-in
+  std::map<std::string, std::size_t> numbers_;  ///< of keywords with one name
 };
 
 #endif
