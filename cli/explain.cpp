@@ -58,7 +58,9 @@ std::string sightings(const std::vector<LA_EXPLANATION::PROBE>& probes) {
   }
   std::string text = "\nLooked in, in this order:\n";
   for (std::size_t i = 0; i < places.size(); ++i) {
-    text += "  " + std::to_string(i + 1) + "  " + places[i] + "\n";
+    const bool is_there = Port::File::isdirectory(places[i].c_str());
+    text += "  " + std::to_string(i + 1) + "  " + places[i] + (is_there ? "" : "  (no directory)") +
+            "\n";
   }
   text += "for:\n";
   for (const auto& [name, seen] : files) {

@@ -78,8 +78,7 @@ class child_start {
     ::posix_spawnattr_init(&attributes_);
     const int group = own_group ? POSIX_SPAWN_SETPGROUP : 0;
     ::posix_spawnattr_setflags(
-        &attributes_,
-        static_cast<short>(POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF | group));
+        &attributes_, static_cast<short>(POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF | group));
     sigset_t signals;
     ::sigemptyset(&signals);
     ::posix_spawnattr_setsigmask(&attributes_, &signals);
@@ -226,7 +225,8 @@ class default_child_signal {
   struct sigaction before_ = {};
 };
 
-/// Reaps the child once it has ended. Returns 0 and sets its exit code, or returns the error number.
+/// Reaps the child once it has ended. Returns 0 and sets its exit code, or returns the error
+/// number.
 int reap(pid_t child, int& exit_code) {
   int status = 0;
   while (::waitpid(child, &status, 0) < 0) {

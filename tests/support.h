@@ -90,8 +90,9 @@ struct Ran {
 
 /// Runs a program in the current directory, with nothing on its standard input unless some is
 /// given. meanwhile is called with its number, which is also that of a process group.
-Ran run(const std::vector<std::string>& words, const std::string& input = "",
-        const std::function<void(pid_t)>& meanwhile = [](pid_t) {});
+Ran run(
+    const std::vector<std::string>& words, const std::string& input = "",
+    const std::function<void(pid_t)>& meanwhile = [](pid_t) {});
 
 /// The content of a file.
 std::string slurp(const std::string& path);
