@@ -20,6 +20,7 @@ install(DIRECTORY data DESTINATION ${CMAKE_INSTALL_DATADIR}/kestrel-launcher COM
 install(FILES docs/json-output.schema.json
   DESTINATION ${CMAKE_INSTALL_DATADIR}/kestrel-launcher COMPONENT command)
 install(FILES docs/kestrel-launch.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT command)
+install(FILES docs/kestrel-rules.5 DESTINATION ${CMAKE_INSTALL_MANDIR}/man5 COMPONENT command)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/completion.bash RENAME kestrel-launch
   DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT command)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/completion.zsh RENAME _kestrel-launch

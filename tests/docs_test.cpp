@@ -1,5 +1,5 @@
 // The guides hold to what the system does: docs/rules.md shows what its samples really give, and
-// the man page names exactly the options that there are.
+// the man pages name the options and the keywords that there are.
 #include <gtest/gtest.h>
 
 #include <regex>
@@ -7,7 +7,9 @@
 #include <utility>
 
 #include "cli/settings.h"
+#include "launcher/command_options.h"
 #include "optparse/baslaoptparse.h"
+#include "rules/baslarules.h"
 #include "support.h"
 
 namespace {
@@ -74,6 +76,11 @@ TEST(Docs, SamplesGiveWhatTheGuideShows) {
   EXPECT_EQ(samples.findings, "");
 }
 
+/// A list of the page has an item like this regular expression.
+void expect_item(const std::string& page, const std::string& item) {
+  EXPECT_TRUE(std::regex_search(page, std::regex("\n\\.T[PQ]\n" + item + "[\\\\\n]"))) << item;
+}
+
 TEST(Docs, ManPageNamesTheOptionsThatThereAre) {
   const std::string page =
       std::regex_replace(guide("kestrel-launch.1"), std::regex("\\\\(f.|(?=-))"), "");
@@ -82,12 +89,18 @@ TEST(Docs, ManPageNamesTheOptionsThatThereAre) {
     std::string item = o.short_name != nullptr ? o.short_name + std::string(", ") : "";
     item.append(o.long_name).append(o.argument != nullptr ? " " : "");
     if (o.argument != nullptr) item += o.argument;
-    EXPECT_NE(page.find("\n.TP\n" + item + "\n"), page.npos) << item;
+    expect_item(page, item);
   }
   const std::regex long_name("--[a-z-]+");
   for (std::sregex_iterator at(page.begin(), page.end(), long_name), end; at != end; ++at) {
     EXPECT_NE(help.find(at->str() + " "), help.npos) << at->str();
   }
+}
+
+TEST(Docs, ManPageOfRulesNamesTheKeywordsThatThereAre) {
+  const std::string page = guide("kestrel-rules.5");
+  for (const char* word : rule_keywords()) expect_item(page, R"(.*\\fB)" + std::string(word));
+  for (const char* word : LA_OPTION_KEYWORDS) expect_item(page, R"(.*\\fB\$)" + std::string(word));
 }
 
 }  // namespace
