@@ -9,9 +9,11 @@ TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db pkgconf
 DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
 PACKAGE_PACKAGES = $(BUILD_PACKAGES) dpkg-dev file
 BENCH_PACKAGES = $(BUILD_PACKAGES) ninja-build python3 strace valgrind
+COOKBOOK_PACKAGES = $(BUILD_PACKAGES) python3 yosys nextpnr-ice40 fpga-icestorm lepton-eda \
+  berkeley-abc m4 zip unzip
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo test bench sanitize lint package clean help
+.PHONY: all build demo cookbook test bench sanitize lint package clean help
 
 all: build
 
@@ -25,6 +27,12 @@ demo:
 	@tools/setup $(DEMO_PACKAGES)
 	@$(MAKE) --no-print-directory build >/dev/null
 	@tools/demo $(BUILD)
+
+# The recipes of the cookbook, with the programs that they are about.
+cookbook:
+	@tools/setup $(COOKBOOK_PACKAGES)
+	@$(MAKE) --no-print-directory build >/dev/null
+	@tools/cookbook $(BUILD) docs/cookbook.md
 
 test:
 	@tools/setup $(TEST_PACKAGES)
@@ -66,6 +74,7 @@ clean:
 help:
 	@echo "make           build the library and the command"
 	@echo "make demo      set up, build, and resolve the examples"
+	@echo "make cookbook  set up, build, and run the recipes of docs/cookbook.md"
 	@echo "make test      set up, build, and pass all tests"
 	@echo "make bench     measure the launcher beside make and ninja; ROWS=\"1 3\" QUICK=1"
 	@echo "make sanitize  pass all tests under the sanitizers"
