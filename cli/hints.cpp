@@ -37,6 +37,13 @@ std::string hint_on_netlister(const LA_RULE& rule) {
   return "its netlister " + words[0] + (is_path ? " cannot be started" : " is not on PATH");
 }
 
+std::string hint_on_directory(const LA_RULE& rule) {
+  const char* directory = rule.netlister_dir ? rule.netlister_dir->get_dir() : nullptr;
+  if (rule.netlister_dir_flag != DIR_GIVEN || directory == nullptr) return {};
+  if (Port::File::isdirectory(directory)) return {};
+  return std::string("its netlister directory ") + directory + " is not there";
+}
+
 std::string hint_on_relation(const LA_RULE& rule, const relation& to_others) {
   if (to_others.overridden_by != nullptr) {
     return std::string("it is never used: rule ") + to_others.overridden_by->rule_name.get() +
@@ -68,6 +75,7 @@ std::vector<std::string> hints_on(const LA_RULE_SET& set) {
         hint_on_relation(rule, relations[static_cast<std::size_t>(i)])};
     if (is_run) {
       found.push_back(hint_on_netlister(rule));
+      found.push_back(hint_on_directory(rule));
       found.push_back(hint_on_options(rule.netlister_options));
       if (rule.netlister_top_options) found.push_back(hint_on_options(rule.netlister_top_options));
     }
