@@ -101,9 +101,9 @@ std::string hint_on(const std::string& error) {
     const std::size_t at = error.find(before);
     if (at == error.npos) continue;
     const std::size_t start = at + before.size();
-    const std::string word = error.substr(start, error.find(after, start) - start);
+    std::string word = error.substr(start, error.find(after, start) - start);
     const std::string meant = nearest(word, keywords);
-    return meant.empty() ? "" : word + ": did you mean " + meant + "?";
+    return meant.empty() ? "" : word.append(": did you mean ").append(meant).append("?");
   }
   return {};
 }
