@@ -28,12 +28,12 @@ void record(void* self, const Port_Msg& m) {
   static_cast<Messages*>(self)->records.push_back({m.level, origin, m.text});
 }
 
+}  // namespace
+
 std::string slurp(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   return {std::istreambuf_iterator<char>(in), {}};
 }
-
-}  // namespace
 
 std::string replaced(std::string text, const std::string& from, const std::string& to) {
   for (std::size_t at = text.find(from); at != text.npos; at = text.find(from, at + to.size())) {
@@ -172,7 +172,7 @@ std::string shown(std::initializer_list<const char*> texts) {
   return all.substr(1);
 }
 
-int main(int count, char** words) {
+void fix_environment() {
   for (const char* name : {"LAUNCHER_DETAIL", "LA_DISABLE", "LA_TEST", "MYCORVANE", "CORVANE",
                            "CVN_KESTREL_ALLOW_PLF", "NO_COLOR"}) {
     ::unsetenv(name);
@@ -180,6 +180,4 @@ int main(int count, char** words) {
   ::setenv("LC_ALL", "C", 1);
   ::setenv("TZ", "UTC", 1);
   ::setenv("PATH", "/usr/bin:/bin", 1);
-  ::testing::InitGoogleTest(&count, words);
-  return RUN_ALL_TESTS();
 }
