@@ -2,13 +2,15 @@
 # make test    set up, build, pass all tests
 BUILD ?= build
 JOBS ?= $(shell nproc)
+SECONDS ?= 60
 
 BUILD_PACKAGES = g++ cmake make
 TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db
 DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
+FUZZ_PACKAGES = $(TEST_PACKAGES) clang-14 libclang-rt-14-dev
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo test sanitize lint clean help
+.PHONY: all build demo test sanitize fuzz lint clean help
 
 all: build
 
@@ -38,6 +40,13 @@ sanitize:
 	@cd $(BUILD)-sanitize && ctest --output-on-failure --parallel $(JOBS)
 	@echo "All tests passed under AddressSanitizer and UndefinedBehaviorSanitizer."
 
+# Looks for inputs for which something does not hold, for so many seconds in each target.
+fuzz:
+	@tools/setup $(FUZZ_PACKAGES)
+	@cmake --preset fuzz -B $(BUILD)-fuzz >/dev/null
+	@cmake --build $(BUILD)-fuzz --parallel $(JOBS) --target fuzz-targets
+	@tools/fuzz $(BUILD)-fuzz $(SECONDS)
+
 # The formatter and the linter, which must have nothing to say.
 lint:
 	@tools/setup $(LINT_PACKAGES) $(TEST_PACKAGES)
@@ -51,5 +60,6 @@ help:
 	@echo "make demo      set up, build, and resolve the examples"
 	@echo "make test      set up, build, and pass all tests"
 	@echo "make sanitize  pass all tests under the sanitizers"
+	@echo "make fuzz      look for inputs that break something, for SECONDS=$(SECONDS) in each target"
 	@echo "make lint      check format and code with clang's tools"
 	@echo "make clean     remove what was built"
