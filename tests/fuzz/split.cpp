@@ -10,10 +10,12 @@ void examine(const std::string& input, Tree& /*tree*/) {
   }
   std::string joined, kept = input;
   for (const std::string& word : words) {
-    // Double quotes in a word come from the single quotes at its beginning.
+    // Double quotes in a word come from the single quotes at its beginning. The rest of it can do
+    // without quotes unless it has blanks.
     const std::size_t cut = word.rfind('"') + 1;
     if (cut > 0) joined += "'" + word.substr(0, cut) + "'";
-    joined += '"' + word.substr(cut) + "\"\t";
+    const bool bare = word.find_first_of(" \t") == word.npos && word[0] != '\0' && word[0] != '\'';
+    joined += bare ? word.substr(cut) + "\t" : '"' + word.substr(cut) + "\"\t";
   }
   EXPECT_TRUE(Port_Process::Split(joined, again) && again == words) << joined;
   // Only blanks and quotes get lost.
