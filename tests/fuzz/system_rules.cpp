@@ -15,8 +15,8 @@ void examine(const std::string& input, Tree& tree) {
     const std::string value = reader.GetStringByKey(key.data(), "\n", 0, nullptr, 0).c_str();
     // The fields are all of the value but blanks and commas.
     std::string fields;
-    for (short i = 0; i <= std::ssize(value); ++i) {
-      fields += reader.GetStringByKey(key.data(), ",", i, nullptr, 0).c_str();
+    for (std::size_t i = 0; i <= value.size(); ++i) {
+      fields += reader.GetStringByKey(key.data(), ",", static_cast<short>(i), nullptr, 0).c_str();
     }
     EXPECT_TRUE(replaced(fields, " ", "") == replaced(replaced(value, " ", ""), ",", "") ||
                 value.find('\t') != value.npos);
