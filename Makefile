@@ -1,16 +1,19 @@
 # make demo    set up, build, resolve the examples
 # make test    set up, build, pass all tests
+# make bench   set up, build, measure; make bench ROWS="1 3" QUICK=1
 BUILD ?= build
 JOBS ?= $(shell nproc)
 SECONDS ?= 60
 
 BUILD_PACKAGES = g++ cmake make
-TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db
+TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db pkgconf
 DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
 FUZZ_PACKAGES = $(TEST_PACKAGES) clang-14 libclang-rt-14-dev
+PACKAGE_PACKAGES = $(BUILD_PACKAGES) dpkg-dev file
+BENCH_PACKAGES = $(BUILD_PACKAGES) ninja-build python3 strace valgrind
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo test sanitize fuzz lint clean help
+.PHONY: all build demo test bench sanitize fuzz lint package clean help
 
 all: build
 
@@ -32,6 +35,13 @@ test:
 	@cd $(BUILD) && ctest --output-on-failure --parallel $(JOBS)
 	@echo "All tests passed, of $(BUILD)/bin/kestrel-launch and its library."
 
+# Some eight minutes, on a machine with nothing else to do.
+bench:
+	@tools/setup $(BENCH_PACKAGES)
+	@cmake -S . -B $(BUILD) -DCMAKE_BUILD_TYPE=Release -DKESTREL_TESTS=OFF -DKESTREL_BENCH=ON >/dev/null
+	@cmake --build $(BUILD) --parallel $(JOBS) --target bench
+	@bench/run --bin $(BUILD)/bin $(if $(QUICK),--quick) $(ROWS)
+
 # The tests again, under AddressSanitizer (with its leak check) and UndefinedBehaviorSanitizer.
 sanitize:
 	@tools/setup $(TEST_PACKAGES)
@@ -52,6 +62,13 @@ lint:
 	@tools/setup $(LINT_PACKAGES) $(TEST_PACKAGES)
 	@tools/lint $(BUILD)
 
+# Debian packages of the command, the library, and what programs that use it are built with.
+package:
+	@tools/setup $(PACKAGE_PACKAGES)
+	@cmake -S . -B $(BUILD)-package -DCMAKE_BUILD_TYPE=Release -DCMAKE_INSTALL_PREFIX=/usr -DKESTREL_TESTS=OFF >/dev/null
+	@cmake --build $(BUILD)-package --parallel $(JOBS)
+	@cd $(BUILD)-package && cpack -G DEB >/dev/null && ls *.deb | sed 's|^|Made $(BUILD)-package/|'
+
 clean:
 	@rm -rf $(BUILD) $(BUILD)-*
 
@@ -59,7 +76,9 @@ help:
 	@echo "make           build the library and the command"
 	@echo "make demo      set up, build, and resolve the examples"
 	@echo "make test      set up, build, and pass all tests"
+	@echo "make bench     measure the launcher beside make and ninja; ROWS=\"1 3\" QUICK=1"
 	@echo "make sanitize  pass all tests under the sanitizers"
 	@echo "make fuzz      look for inputs that break something, for SECONDS=$(SECONDS) in each target"
 	@echo "make lint      check format and code with clang's tools"
+	@echo "make package   make Debian packages"
 	@echo "make clean     remove what was built"

@@ -4,6 +4,7 @@
 
 #include <cstdio>
 #include <cstdlib>
+#include <utility>
 
 #include "host/utf8.h"
 
@@ -52,19 +53,16 @@ void console::show(void* self, const Port_Msg& message) {
   std::fwrite(text.data(), 1, text.size(), stderr);
 }
 
-status_to_output::status_to_output() : before_(Port_MsgManData::setSink({show, this, false})) {}
+diversion::diversion(std::function<bool(const Port_Msg&)> take)
+    : take_(std::move(take)), before_(Port_MsgManData::setSink({show, this, false})) {}
 
-status_to_output::~status_to_output() {
+diversion::~diversion() {
   Port_MsgManData::setSink(before_);
 }
 
-void status_to_output::show(void* self, const Port_Msg& message) {
-  const Port_MsgSink& before = static_cast<status_to_output*>(self)->before_;
-  if (message.level == PORT_MSG_STATUS) {
-    std::fputs(message.text, stdout);
-  } else {
-    before.function(before.context, message);
-  }
+void diversion::show(void* self, const Port_Msg& message) {
+  const auto& [take, before] = *static_cast<diversion*>(self);
+  if (!take(message)) before.function(before.context, message);
 }
 
 void complain(const std::string& text) {

@@ -2,6 +2,7 @@
 #ifndef KESTREL_CLI_CONSOLE_H
 #define KESTREL_CLI_CONSOLE_H
 
+#include <functional>
 #include <string>
 #include <string_view>
 
@@ -26,17 +27,18 @@ class console {
   Port_MsgSink before_;
 };
 
-/// Sends status messages to standard output, until it is destroyed.
-class status_to_output {
+/// Takes messages away, until it is destroyed. Those that take says no to are shown as before.
+class diversion {
  public:
-  status_to_output();
-  status_to_output(const status_to_output&) = delete;
-  status_to_output& operator=(const status_to_output&) = delete;
-  ~status_to_output();
+  explicit diversion(std::function<bool(const Port_Msg&)> take);
+  diversion(const diversion&) = delete;
+  diversion& operator=(const diversion&) = delete;
+  ~diversion();
 
  private:
   static void show(void* self, const Port_Msg& message);
 
+  std::function<bool(const Port_Msg&)> take_;
   Port_MsgSink before_;
 };
 

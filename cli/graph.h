@@ -7,7 +7,9 @@
 #include "rules/baslarules.h"
 
 /// The rules as a directed graph in the language of Graphviz: extensions are nodes, rules are
-/// edges, in the order of the set.
-std::string graph_of(const DARRAY_LA_RULE_PTR& rules);
+/// edges, in the order of the set, each file of rules in a line style of its own. A rule that is
+/// never used, as one before it has the same source and target, is grey; one that can lead back to
+/// itself is red.
+std::string graph_of(const LA_RULE_SET& set);
 
 #endif

@@ -2,20 +2,33 @@
 //
 //   settings   reads the command line; holds the table of options
 //   console    shows messages and makes JSON
+//   completion completes command lines in a shell
+//   explain    tells why
 //   graph      draws the rules
+//   signals    ends the netlister when the command is to end
 //   main       does what the command line asks for
+#include <signal.h>
+
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
 #include <fstream>
 #include <iostream>
+#include <optional>
 #include <string>
 #include <vector>
 
+#include "cli/completion.h"
 #include "cli/console.h"
+#include "cli/explain.h"
 #include "cli/graph.h"
+#include "cli/hints.h"
 #include "cli/settings.h"
+#include "cli/signals.h"
+#include "host/pm_pic.h"
 #include "host/port_file.h"
+#include "host/port_interrupt.h"
 #include "launcher/baslauncher.h"
 #include "rules/baslarules.h"
 
@@ -85,16 +98,38 @@ bool is_dry_run() {
   return std::getenv("LA_TEST") != nullptr;
 }
 
-int resolve(settings& set, const console& shown) {
+LA_LAUNCHER launcher_of(settings& set) {
   const auto array = [](std::vector<const char*>& texts) {
     return texts.empty() ? nullptr : texts.data();
   };
-  LA_LAUNCHER launcher(set.part, array(set.search_dirs), static_cast<short>(set.search_dirs.size()),
-                       array(set.libraries), static_cast<short>(set.libraries.size()),
-                       set.output_dir, set.user_rules, set.force, set.ignore_timestamps,
-                       set.ignore_locs, set.add_pads, set.quiet, set.aul);
+  return {set.part,
+          array(set.search_dirs),
+          static_cast<short>(set.search_dirs.size()),
+          array(set.libraries),
+          static_cast<short>(set.libraries.size()),
+          set.output_dir,
+          set.user_rules,
+          set.force,
+          set.ignore_timestamps,
+          set.ignore_locs,
+          set.add_pads,
+          set.quiet,
+          set.aul};
+}
+
+/// The exit status after one more name.
+int worse(int status, short result) {
+  return std::max(status, result == LA_FAILED      ? int{FAILED}
+                          : result == LA_NOT_FOUND ? int{NOT_ALL_FOUND}
+                                                   : int{ALL_FOUND});
+}
+
+int resolve(settings& set, const console& shown) {
+  LA_LAUNCHER launcher = launcher_of(set);
   int status = launcher.ok ? ALL_FOUND : FAILED;
-  for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
+  const signal_handling while_it_resolves;
+  const auto goes_on = [] { return Port_Interrupt::Requested() == 0 && !std::ferror(stdout); };
+  for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
     const std::string& name = set.names[i];
     if (shown.is_terminal() && set.names.size() > 1) {
       std::fprintf(stderr, "[%zu/%zu] %s\n", i + 1, set.names.size(), name.c_str());
@@ -109,37 +144,93 @@ int resolve(settings& set, const console& shown) {
       netlist[0] = '\0';
     }
     print_result(set, name, result, source, netlist);
-    if (result == LA_FAILED) status = FAILED;
-    if (result == LA_NOT_FOUND) {
-      complain("not found: " + name);
-      if (status == ALL_FOUND) status = NOT_ALL_FOUND;
-    }
+    if (result == LA_NOT_FOUND) complain("not found: " + name);
+    status = worse(status, result);
   }
   if (set.json) print_totals(launcher.ok, launcher.errors, launcher.warnings);
   return status;
 }
 
-int show_rules(const settings& set) {
-  const LA_RULE_SET rules(set.part, set.user_rules);
-  if (rules.is_valid && rules.rules.count == 0) {
+int explain(settings& set) {
+  LA_LAUNCHER launcher = launcher_of(set);
+  int status = launcher.ok ? ALL_FOUND : FAILED;
+  std::string error;
+  // The explanation says what the messages say, and the errors are its answers.
+  const diversion diverted([&error](const Port_Msg& message) {
+    if (message.level == PORT_MSG_ERROR) error += message.text;
+    return message.level != PORT_MSG_WARNING;
+  });
+  for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
+    LA_EXPLANATION why;
+    launcher.explain_to(&why);
+    char source[LA_MAX_PATH];
+    char netlist[LA_MAX_PATH];
+    error.clear();
+    const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
+    if (i > 0) std::puts("");
+    std::fputs(explained({set.names[i], result, netlist, error}, why).c_str(), stdout);
+    status = worse(status, result);
+  }
+  return status;
+}
+
+/// Says so when there are no rules at all: the data of the installation is probably not found.
+void expect_rules(const LA_RULE_SET& set) {
+  if (set.is_valid && set.rules.count == 0) {
     complain("there are no rules; do MYCORVANE and CORVANE name installation roots?");
   }
-  if (rules.is_valid && set.what == task::LIST_RULES) {
-    const status_to_output redirected;
-    rules.dump(set.detail);
-  }
-  if (rules.is_valid && set.what == task::GRAPH) std::fputs(graph_of(rules.rules).c_str(), stdout);
-  if (set.what == task::CHECK) {
-    if (set.json) print_totals(rules.is_valid, 0, 0);
-    if (!set.json && rules.is_valid)
-      std::printf("Rules checked: %d, all good\n", rules.rules.count);
-  }
+}
+
+int check(const settings& set) {
+  std::vector<std::string> hints;
+  std::optional<diversion> reading([&hints](const Port_Msg& message) {
+    const std::string hint = hint_on(message.text);
+    const bool is_new = std::find(hints.begin(), hints.end(), hint) == hints.end();
+    if (!hint.empty() && is_new) hints.push_back(hint);
+    return false;
+  });
+  const LA_RULE_SET rules(set.part, set.user_rules);
+  reading.reset();
+  expect_rules(rules);
+  if (rules.is_valid) hints = hints_on(rules);
+  for (const std::string& hint : hints) complain("hint: " + hint);
+  if (set.json) print_totals(rules.is_valid, 0, 0);
+  if (!set.json && rules.is_valid) std::printf("Rules checked: %d, all good\n", rules.rules.count);
   return rules.is_valid ? ALL_FOUND : FAILED;
+}
+
+int list_rules(const settings& set) {
+  const LA_RULE_SET rules(set.part, set.user_rules);
+  expect_rules(rules);
+  const diversion to_output([](const Port_Msg& message) {
+    return message.level == PORT_MSG_STATUS && std::fputs(message.text, stdout) >= 0;
+  });
+  if (rules.is_valid) rules.dump(set.detail);
+  return rules.is_valid ? ALL_FOUND : FAILED;
+}
+
+int draw_graph(const settings& set) {
+  const LA_RULE_SET rules(set.part, set.user_rules);
+  expect_rules(rules);
+  if (rules.is_valid) std::fputs(graph_of(rules).c_str(), stdout);
+  return rules.is_valid ? ALL_FOUND : FAILED;
+}
+
+int list_parts() {
+  for (const std::string& part : PM_PIC::all_parts()) std::printf("%s\n", part.c_str());
+  return ALL_FOUND;
+}
+
+int print_completion(const std::string& shell) {
+  const std::string script = completion_for(shell);
+  if (script.empty()) complain("--completion: there is none for \"" + shell + "\"");
+  std::fputs(script.c_str(), stdout);
+  return script.empty() ? FAILED : ALL_FOUND;
 }
 
 int run(settings& set) {
   // The library's switches.
-  if (set.dry_run) ::setenv("LA_TEST", "1", 1);
+  if (set.dry_run || set.what == task::EXPLAIN) ::setenv("LA_TEST", "1", 1);
   if (set.detail) ::setenv("LAUNCHER_DETAIL", "1", 1);
   const console shown(set.debug);
   switch (set.what) {
@@ -151,15 +242,26 @@ int run(settings& set) {
       return ALL_FOUND;
     case task::RESOLVE:
       return resolve(set, shown);
+    case task::EXPLAIN:
+      return explain(set);
+    case task::CHECK:
+      return check(set);
+    case task::LIST_PARTS:
+      return list_parts();
+    case task::COMPLETION:
+      return print_completion(set.shell);
+    case task::LIST_RULES:
+      return list_rules(set);
     default:
-      return show_rules(set);
+      return draw_graph(set);
   }
 }
 
 int run_command_line(int count, const char* const* words) {
   settings set;
   std::string wrong = read_command_line(count, words, set);
-  if (wrong.empty() && set.what == task::RESOLVE) wrong = complete(set);
+  const bool resolves = set.what == task::RESOLVE || set.what == task::EXPLAIN;
+  if (wrong.empty() && resolves) wrong = complete(set);
   if (!wrong.empty()) {
     complain(wrong);
     std::fputs("Try 'kestrel-launch --help'.\n", stderr);
@@ -177,7 +279,10 @@ int run_command_line(int count, const char* const* words) {
 
 int main(int count, char** words) {
   try {
-    return run_command_line(count - 1, words + 1);
+    const int status = run_command_line(count - 1, words + 1);
+    // Who interrupts the command shall see that it has ended so.
+    if (const int signal = Port_Interrupt::Requested()) ::raise(signal);
+    return status;
   } catch (const std::exception& failure) {
     complain(failure.what());
     return FAILED;

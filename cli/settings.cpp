@@ -2,13 +2,14 @@
 
 #include <algorithm>
 #include <climits>
-#include <numeric>
 #include <string_view>
+
+#include "cli/nearest.h"
 
 namespace {
 
 constexpr option OPTIONS[] = {
-    {"-p", "--part", "NAME", "device part name",
+    {"-p", "--part", "PART", "device part name",
      [](settings& to, const char* text) { to.part = text; }},
     {"-sd", "--search-dir", "DIR", "search directory; may be repeated, searched in order",
      [](settings& to, const char* text) { to.search_dirs.push_back(text); }},
@@ -39,6 +40,8 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.dry_run = true; }},
     {"-d", "--detail", nullptr, "say why, and from where",
      [](settings& to, const char*) { to.detail = true; }},
+    {"-e", "--explain", nullptr, "tell what would be done for each name, and why; start nothing",
+     [](settings& to, const char*) { to.what = task::EXPLAIN; }},
     {nullptr, "--json", nullptr, "results as JSON, one object per line",
      [](settings& to, const char*) { to.json = true; }},
     {nullptr, "--check", nullptr, "load and check the rules, resolve nothing",
@@ -47,6 +50,13 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.what = task::LIST_RULES; }},
     {nullptr, "--graph", nullptr, "print the rules as a graph for Graphviz",
      [](settings& to, const char*) { to.what = task::GRAPH; }},
+    {nullptr, "--list-parts", nullptr, "print the device parts that are known",
+     [](settings& to, const char*) { to.what = task::LIST_PARTS; }},
+    {nullptr, "--completion", "SHELL", "print completions for a shell: bash or zsh",
+     [](settings& to, const char* text) {
+       to.what = task::COMPLETION;
+       to.shell = text;
+     }},
     {nullptr, "--debug", nullptr, "show debug traces",
      [](settings& to, const char*) { to.debug = true; }},
     {"-h", "--help", nullptr, "print this help",
@@ -55,31 +65,11 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.what = task::VERSION; }},
 };
 
-/// How many characters must be changed, added or left out to make b of a.
-std::size_t distance(std::string_view a, std::string_view b) {
-  std::vector<std::size_t> row(b.size() + 1);
-  std::iota(row.begin(), row.end(), std::size_t(0));
-  for (std::size_t i = 0; i < a.size(); ++i) {
-    std::size_t diagonal = row[0]++;
-    for (std::size_t j = 0; j < b.size(); ++j) {
-      const std::size_t replaced = diagonal + (a[i] != b[j]);
-      diagonal = row[j + 1];
-      row[j + 1] = std::min({replaced, diagonal + 1, row[j] + 1});
-    }
-  }
-  return row.back();
-}
-
-std::string unknown_option(std::string_view name) {
-  const auto closer = [name](const option& a, const option& b) {
-    return distance(name, a.long_name) < distance(name, b.long_name);
-  };
-  const option& nearest = *std::min_element(std::begin(OPTIONS), std::end(OPTIONS), closer);
-  std::string text = "unknown option " + std::string(name);
-  if (distance(name, nearest.long_name) * 2 < name.size()) {
-    text += std::string("; did you mean ") + nearest.long_name + "?";
-  }
-  return text;
+std::string unknown_option(const std::string& name) {
+  std::vector<const char*> names;
+  for (const option& o : OPTIONS) names.push_back(o.long_name);
+  const std::string meant = nearest(name, names);
+  return "unknown option " + name + (meant.empty() ? "" : "; did you mean " + meant + "?");
 }
 
 /// One command line on its way into settings.
@@ -147,7 +137,8 @@ std::string read_command_line(int count, const char* const* words, settings& to)
   // The launcher counts both in 16 bits.
   if (to.search_dirs.size() > SHRT_MAX) return "there are too many search directories";
   if (to.libraries.size() > SHRT_MAX) return "there are too many library entries";
-  if (to.what == task::RESOLVE && to.names.empty() && to.names_files.empty()) {
+  const bool needs_names = to.what == task::RESOLVE || to.what == task::EXPLAIN;
+  if (needs_names && to.names.empty() && to.names_files.empty()) {
     return "no netlist is named";
   }
   return {};

@@ -7,7 +7,17 @@
 #include <vector>
 
 /// What the command is to do.
-enum class task { RESOLVE, CHECK, LIST_RULES, GRAPH, HELP, VERSION };
+enum class task {
+  RESOLVE,
+  EXPLAIN,
+  CHECK,
+  LIST_RULES,
+  LIST_PARTS,
+  GRAPH,
+  COMPLETION,
+  HELP,
+  VERSION
+};
 
 /// The settings of one call. The texts belong to the command line.
 struct settings {
@@ -17,6 +27,7 @@ struct settings {
   std::vector<const char*> libraries;
   const char* output_dir = nullptr;
   const char* user_rules = nullptr;
+  const char* shell = nullptr;
   std::vector<const char*> names_files;
   std::vector<std::string> names;
   bool force = false;
@@ -32,7 +43,7 @@ struct settings {
   bool debug = false;
 };
 
-/// One option. The table of them is the source of the parser and of the help.
+/// One option. The table of them is the source of the parser, of the help and of the completions.
 struct option {
   const char* short_name;  ///< with its dash; null when there is none
   const char* long_name;

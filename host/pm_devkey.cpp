@@ -10,7 +10,7 @@ PM_DEVKEY::PM_DEVKEY(const char* file_name, PM_PIC* device, unsigned char /*unus
   below_root += file_name;
   for (const Port::StringBase<char>& root : Port::CvnenvPath::GetInstance()) {
     const std::string path = root.c_str() + below_root;
-    if (Port::File::exist(path.c_str())) {
+    if (!Port::File::missing(path.c_str())) {
       location_ = path;
       return;
     }

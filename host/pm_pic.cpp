@@ -1,6 +1,7 @@
 #include "host/pm_pic.h"
 
 #include <algorithm>
+#include <set>
 #include <string>
 #include <utility>
 
@@ -48,7 +49,38 @@ bool take_entry(std::string& rest, const StaticAcdRead& table, const char* devic
   }
 }
 
+/// Each name with "-" and each entry of the field behind it; the names as they are where the field
+/// lists nothing.
+std::vector<std::string> extended(const std::vector<std::string>& names, const StaticAcdRead& table,
+                                  const char* device, short field) {
+  std::vector<std::string> longer;
+  for (const std::string& name : names) {
+    for (short i = 0; entry(table, device, field, i) != nullptr; ++i) {
+      longer.push_back(name + "-" + entry(table, device, field, i).get());
+    }
+  }
+  return longer.empty() ? names : longer;
+}
+
 }  // namespace
+
+std::vector<std::string> PM_PIC::all_parts() {
+  std::vector<std::string> parts;
+  std::set<std::string> known;
+  for (const Port::StringBase<char>& root : Port::CvnenvPath::GetInstance()) {
+    const std::string path = std::string(root.c_str()) + "/data/devices.acd";
+    const StaticAcdRead table(path.c_str(), nullptr, nullptr, 1, 0, 1);
+    for (const std::string_view key : table.keys()) {
+      const std::string device(key);
+      if (!known.insert(device).second) continue;
+      const auto packaged = extended({device}, table, device.c_str(), PACKAGE_FIELD);
+      for (std::string& part : extended(packaged, table, device.c_str(), SPEED_FIELD)) {
+        parts.push_back(std::move(part));
+      }
+    }
+  }
+  return parts;
+}
 
 PM_PIC::PM_PIC(const char* part_name, unsigned char /*unused*/, PM_PARTNAME_BINDING /*binding*/) {
   bool readable = true;

@@ -2,6 +2,9 @@
 #ifndef KESTREL_HOST_PM_PIC_H
 #define KESTREL_HOST_PM_PIC_H
 
+#include <string>
+#include <vector>
+
 #include "host/ut_str.h"
 
 /// How a part name is bound to a device; the one way there is.
@@ -30,6 +33,9 @@ class PM_PIC {
   char* get_device() const { return field(device_); }
   char* get_package() const { return field(package_); }
   char* get_speed() const { return field(speed_); }
+
+  /// All parts of the device tables, as precisely as they can be named, in the order of the tables.
+  static std::vector<std::string> all_parts();
 
  private:
   static char* field(const la_text& text) { return const_cast<char*>(text.get()); }

@@ -81,6 +81,16 @@ void Stream::readline(std::string& line) {
   if (ended && line.ends_with('\r')) line.pop_back();
 }
 
+Place::Place() : descriptor_(::open(".", O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
+
+Place::~Place() {
+  if (descriptor_ >= 0) ::close(descriptor_);
+}
+
+bool Place::enter() const {
+  return ::fchdir(descriptor_) == 0;
+}
+
 FileStatus File::status(const char* path) {
   struct stat found = {};
   if (::stat(path, &found) != 0 || S_ISDIR(found.st_mode)) return {};
@@ -89,6 +99,11 @@ FileStatus File::status(const char* path) {
 
 bool File::exist(const char* path) {
   return status(path).exists;
+}
+
+bool File::missing(const char* path) {
+  struct stat found = {};
+  return ::lstat(path, &found) != 0 && (errno == ENOENT || errno == ENOTDIR);
 }
 
 bool File::isdirectory(const char* path) {

@@ -58,6 +58,21 @@ struct FileStatus {
   __int64 time = 0;     ///< modification time, in nanoseconds since 1970; 0 when there is none
 };
 
+/// The directory that is current when this is made, by whatever name it goes later.
+class Place {
+ public:
+  Place();
+  Place(const Place&) = delete;
+  Place& operator=(const Place&) = delete;
+  ~Place();
+
+  /// Makes it the current directory again. Returns false when that fails.
+  bool enter() const;
+
+ private:
+  int descriptor_;
+};
+
 /// The files of the process, by their names in either form.
 class File {
  public:
@@ -65,6 +80,8 @@ class File {
   static FileStatus status(const char* path);
   /// True when there is anything but a directory at path.
   static bool exist(const char* path);
+  /// True when nothing is at path: no file, no directory, no link, and nothing that rights hide.
+  static bool missing(const char* path);
   /// True when path is a directory.
   static bool isdirectory(const char* path);
   /// Sets time to the modification time of path, in nanoseconds since 1970. Returns false, and

@@ -45,8 +45,9 @@ class CvnenvPath {
  public:
   /// The installation roots of the process: the entries of the environment variable MYCORVANE,
   /// then those of CORVANE, each a list separated by ":"; when neither is set,
-  /// share/kestrel-launcher beside the bin directory of the running program if that is there, else
-  /// the directory that the build configured. The list is good until one of the two variables has
+  /// share/kestrel-launcher beside the bin directory of the running program or beside the lib
+  /// directory of the shared library if that is there, else the directory that the build
+  /// configured. The list is good until one of the two variables has
   /// changed and GetInstance is called again.
   static const PathList& GetInstance();
 };

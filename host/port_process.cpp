@@ -14,6 +14,7 @@
 #include <cstring>
 #include <utility>
 
+#include "host/port_interrupt.h"
 #include "host/utf8.h"
 
 namespace {
@@ -44,24 +45,30 @@ struct pipe_ends {
   descriptor write;
 };
 
+/// Moves an end of a pipe out of the way of the standard streams. Returns 0, or the error number.
+int lift(descriptor& end) {
+  if (end.get() > STDERR_FILENO) return 0;
+  end = descriptor(::fcntl(end.get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
+  return end.get() < 0 ? errno : 0;
+}
+
 /// Returns 0, or the error number.
 int open_pipe(pipe_ends& ends) {
   int numbers[2];
   if (::pipe2(numbers, O_CLOEXEC) != 0) return errno;
-  const descriptor low_read(numbers[0]);
-  const descriptor low_write(numbers[1]);
-  ends.read = descriptor(::fcntl(low_read.get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
-  ends.write = descriptor(::fcntl(low_write.get(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
-  if (ends.read.get() < 0 || ends.write.get() < 0) return errno;
+  ends.read = descriptor(numbers[0]);
+  ends.write = descriptor(numbers[1]);
+  if (const int error = lift(ends.read)) return error;
+  if (const int error = lift(ends.write)) return error;
   return ::fcntl(ends.read.get(), F_SETFL, O_NONBLOCK) == 0 ? 0 : errno;
 }
 
 /// What a child starts with: the files of its standard streams, no signal blocked, every signal at
-/// its default.
+/// its default, its process group.
 class child_start {
  public:
   /// output: the descriptor for standard output and error, or -1 to share those of this process.
-  explicit child_start(int output) {
+  child_start(int output, bool own_group) {
     ::posix_spawn_file_actions_init(&actions_);
     ::posix_spawn_file_actions_addopen(&actions_, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
     if (output >= 0) {
@@ -69,11 +76,14 @@ class child_start {
       ::posix_spawn_file_actions_adddup2(&actions_, output, STDERR_FILENO);
     }
     ::posix_spawnattr_init(&attributes_);
-    ::posix_spawnattr_setflags(&attributes_, POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF);
+    const int group = own_group ? POSIX_SPAWN_SETPGROUP : 0;
+    ::posix_spawnattr_setflags(
+        &attributes_, static_cast<short>(POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF | group));
     sigset_t signals;
     ::sigemptyset(&signals);
     ::posix_spawnattr_setsigmask(&attributes_, &signals);
-    ::sigfillset(&signals);
+    // sigfillset leaves out the signals of the C library, and the child would ignore them.
+    std::memset(&signals, 0xFF, sizeof signals);
     ::posix_spawnattr_setsigdefault(&attributes_, &signals);
   }
   child_start(const child_start&) = delete;
@@ -159,11 +169,14 @@ void read_rest(int pipe, line_cutter& lines) {
   }
 }
 
-bool has_ended(pid_t child) {
+/// Whether the child has ended. It stays to be reaped. option: 0 to wait until it has, or WNOHANG.
+bool has_ended(pid_t child, int option) {
   siginfo_t information = {};
-  return ::waitid(P_PID, static_cast<id_t>(child), &information, WEXITED | WNOWAIT | WNOHANG) !=
-             0 ||
-         information.si_pid != 0;
+  int result = 0;
+  do {
+    result = ::waitid(P_PID, static_cast<id_t>(child), &information, WEXITED | WNOWAIT | option);
+  } while (result != 0 && errno == EINTR);
+  return result != 0 || information.si_pid != 0;
 }
 
 /// Hands on what the child writes until it closes its output or ends, whichever comes first. Some
@@ -180,7 +193,7 @@ void pass_output(pid_t child, int pipe, Port_Process& process) {
     const int ready = ::poll(events, 2, wait);
     if (ready < 0 && errno != EINTR) break;
     const bool may_have_ended = end_of_child.get() < 0 || events[1].revents != 0;
-    if (ready >= 0 && may_have_ended && has_ended(child)) {
+    if (ready >= 0 && may_have_ended && has_ended(child, WNOHANG)) {
       read_rest(pipe, lines);
       break;
     }
@@ -212,8 +225,9 @@ class default_child_signal {
   struct sigaction before_ = {};
 };
 
-/// Waits for the child. Returns 0 and sets its exit code, or returns the error number.
-int wait_for(pid_t child, int& exit_code) {
+/// Reaps the child once it has ended. Returns 0 and sets its exit code, or returns the error
+/// number.
+int reap(pid_t child, int& exit_code) {
   int status = 0;
   while (::waitpid(child, &status, 0) < 0) {
     if (errno != EINTR) return errno;
@@ -263,20 +277,23 @@ Port_Process::PROCESS_STATUS Port_Process::Run(const char* command) {
     return fail("\"\"", "the name of the program is empty");
   }
 
+  if (Port_Interrupt::Requested() != 0) return fail(words[0], "interrupted");
+
   pipe_ends ends;
   if (mode_ == 2) {
     if (const int error = open_pipe(ends)) return fail(words[0], std::strerror(error));
   }
   const default_child_signal while_it_runs;
+  const child_start start(ends.write.get(), Port_Interrupt::own_groups());
   pid_t child = 0;
-  if (const int error = child_start(ends.write.get()).spawn(words, child)) {
-    return fail(words[0], std::strerror(error));
-  }
+  if (const int error = start.spawn(words, child)) return fail(words[0], std::strerror(error));
+  Port_Interrupt::child_started(child);
   ends.write.close();
   if (mode_ == 2) pass_output(child, ends.read.get(), *this);
-  if (const int error = wait_for(child, exit_code_)) {
-    return fail(words[0],
-                std::string("its exit code could not be learnt: ") + std::strerror(error));
-  }
-  return PROCESS_ENDED;
+  has_ended(child, 0);
+  Port_Interrupt::child_ended();
+  const int error = reap(child, exit_code_);
+  Port_Interrupt::child_reaped(child);
+  if (error == 0) return PROCESS_ENDED;
+  return fail(words[0], std::string("its exit code could not be learnt: ") + std::strerror(error));
 }

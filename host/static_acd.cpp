@@ -55,7 +55,7 @@ std::string_view piece_at(std::string_view text, std::size_t start, std::string_
 StaticAcdRead::StaticAcdRead(const char* path, const char* /*unused*/, char* const* /*unused*/,
                              unsigned char /*unused*/, unsigned char /*unused*/,
                              unsigned char /*unused*/) {
-  if (!Port::File::exist(path)) return;
+  if (Port::File::missing(path)) return;
   std::unique_ptr<Port::Stream> stream(Port::File::open(path, Port::Stream::READ, true));
   if (stream == nullptr) {
     message().issueError("Launcher: Could not open data file \"%s\".\n", path);

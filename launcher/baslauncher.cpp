@@ -13,9 +13,11 @@
 #include "host/pm_pic.h"
 #include "host/port_env.h"
 #include "host/port_init.h"
+#include "host/port_interrupt.h"
 #include "host/port_msgman.h"
 #include "host/port_string.h"
 #include "launcher/command_options.h"
+#include "launcher/explanation.h"
 #include "launcher/rule_index.h"
 #include "rules/baslarules.h"
 
@@ -209,9 +211,17 @@ short LA_LAUNCHER::find_native(const LA_FULLFILE& given, bool named_kbc, LA_FULL
 
 /// Looks where the name says, then in the search directories.
 bool LA_LAUNCHER::find_file(const LA_FULLFILE& given, LA_FULLFILE& found) {
-  if (!given.exists()) return find_in_searchpaths(given, found);
+  const bool exists = given.exists();
+  note(given, exists ? LA_EXPLANATION::FOUND : LA_EXPLANATION::MISSING);
+  if (!exists) return find_in_searchpaths(given, found);
   found = given;
   return true;
+}
+
+/// Adds a place where a file was looked for to the explanation.
+void LA_LAUNCHER::note(const LA_FULLFILE& file, LA_EXPLANATION::SIGHTING sighting) const {
+  if (explanation == nullptr || file.get_fullfile() == nullptr) return;
+  explanation->probes.push_back({sighting, file.get_fullfile()});
 }
 
 /// Looks in the search directories. All of them are visited, so that the report on files passed
@@ -223,14 +233,19 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULL
   Port::StringBase<char> others;
   for (const auto& dir : counted(searchpaths, num_searchpaths)) {
     const LA_FULLFILE candidate(*dir, file);
-    if (!candidate.exists()) continue;
+    if (!candidate.exists()) {
+      note(candidate, LA_EXPLANATION::MISSING);
+      continue;
+    }
     const Port::StringBase<char> name(candidate.get_fullfile());
     if (!found_any) {
+      note(candidate, LA_EXPLANATION::FOUND);
       found = candidate;
       first = name;
       found_any = true;
     } else if (!(name == first) && others.GetIndexOfString(name, Port::StringBase<char>::EXACT) ==
                                        Port::StringBase<char>::NOT_FOUND) {
+      note(candidate, LA_EXPLANATION::PASSED_OVER);
       others += "\t";
       others += name;
       others += "\n";
@@ -281,8 +296,14 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
           visited[used->rule()] = 0;
           chain.append(rules->rules.elements[used->rule()]);
         }
+        for (level& used : path) {
+          note(used.rule(), LA_EXPLANATION::TAKEN);
+          while (++used.tried < used.producers->size())
+            note(used.rule(), LA_EXPLANATION::NOT_NEEDED);
+        }
         return LA_FOUND;
       }
+      note(needing, named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED : LA_EXPLANATION::NO_SOURCE);
       failed[index->spelling(needing)] = true;
       ++path.back().tried;
       continue;
@@ -291,11 +312,18 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
     const LA_RULE& rule = *rules->rules.elements[i];
     if (visited[i]) {
       report_loop(visited);
-      for (const level& used : path) visited[used.rule()] = 0;
+      for (const level& used : path) {
+        if (visited[used.rule()]) note(used.rule(), LA_EXPLANATION::IN_A_LOOP);
+        visited[used.rule()] = 0;
+      }
       return LA_FAILED;
     }
     const char* only_name = rule.netlist_file->get_name();
-    if (failed[index->spelling(i)] || (only_name != nullptr && !given.match_name(only_name))) {
+    const bool for_another = only_name != nullptr && !given.match_name(only_name);
+    if (for_another || failed[index->spelling(i)]) {
+      note(i, for_another   ? LA_EXPLANATION::FOR_ANOTHER_NAME
+              : named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED
+                            : LA_EXPLANATION::NO_SOURCE);
       ++path.back().tried;
       continue;
     }
@@ -303,6 +331,11 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
     path.push_back({producers_of(index->needed(i)), 0});
   }
   return LA_NOT_FOUND;
+}
+
+/// Adds a rule that was considered to the explanation.
+void LA_LAUNCHER::note(int rule, LA_EXPLANATION::VERDICT verdict) const {
+  if (explanation != nullptr) explanation->rules.push_back({rules->rules.elements[rule], verdict});
 }
 
 /// Looks for the file that a rule reads. Where the user named a file, it is that or none.
@@ -330,22 +363,10 @@ void LA_LAUNCHER::report_loop(const unsigned char* visited) {
 
 namespace {
 
-enum build_decision : short {
-  LA_BUILD_UNSUPPORTED = -3,
-  LA_BUILD_UP_TO_DATE = -2,
-  LA_BUILD_SKIPPED = -1,
-  LA_BUILD_UNDECIDED = 0,
-  LA_BUILD_FORCED = 1,  // From here on the netlister runs.
-  LA_BUILD_MISSING = 2,
-  LA_BUILD_OUT_OF_DATE = 3,
-  LA_BUILD_AFTER_REBUILD = 4,
-  LA_BUILD_NO_TIMESTAMP = 5,
-};
-
 /// How a decision is reported, with the name of the output. Those of -3 and 0 are not status
 /// messages.
 struct decision_report {
-  build_decision decision;
+  LA_BUILD_DECISION decision;
   bool only_detail;
   const char* text;
 };
@@ -367,20 +388,6 @@ Port::FileStatus status_of(const LA_FULLFILE& file) {
   return path != nullptr ? Port::File::status(path) : Port::FileStatus();
 }
 
-/// Compares the rule's dependency files, which lie beside the source, with an output of this time.
-build_decision decide_by_dependency_files(const LA_RULE& rule, const LA_FULLFILE& source,
-                                          __int64 output_time) {
-  if (!rule.has_dependency_files()) return LA_BUILD_UP_TO_DATE;
-  for (const LA_FILE* dependency : *rule.dependency_files) {
-    LA_FULLFILE file(source);
-    if (dependency->get_ext() != nullptr) file.set_ext(dependency->get_ext());
-    if (dependency->get_name() != nullptr) file.set_name(dependency->get_name());
-    const Port::FileStatus status = status_of(file);
-    if (status.exists && status.time > output_time) return LA_BUILD_OUT_OF_DATE;
-  }
-  return LA_BUILD_UP_TO_DATE;
-}
-
 }  // namespace
 
 /// The step of a chain that is being carried out. decision moves on from step to step.
@@ -389,11 +396,14 @@ struct LA_LAUNCHER::build_step {
   const LA_RULE* rule;
   LA_FULLFILE input;
   LA_FULLFILE output;
-  build_decision decision;
+  LA_BUILD_DECISION decision;
   /// What is known of the files. The output of a step that did not run is, as the input of the
   /// next one, not asked for again.
   std::optional<Port::FileStatus> input_status = std::nullopt;
   Port::FileStatus output_status = {};
+  /// The dependency file that is newer than the output.
+  std::string dependency = {};
+  Port::FileStatus dependency_status = {};
 };
 
 /// The current directory of the process during a chain: back home at its end, whatever happens.
@@ -403,19 +413,20 @@ class LA_LAUNCHER::working_directory {
   working_directory(const working_directory&) = delete;
   working_directory& operator=(const working_directory&) = delete;
   ~working_directory() {
-    if (left_) home_.chdir();
+    // A netlister may have moved or removed the directory of that name.
+    if (left_ && !left_->enter()) home_.chdir();
   }
 
   /// The directory that was current when the chain started.
   const LA_DIR& home() const { return home_; }
   void enter(const LA_DIR& directory) {
-    left_ = true;
+    if (!left_) left_.emplace();
     directory.chdir();
   }
 
  private:
   const LA_DIR home_;
-  bool left_ = false;
+  std::optional<Port::Place> left_;
 };
 
 short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
@@ -438,6 +449,7 @@ short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_C
       return LA_FAILED;
     }
     decide(step);
+    note(step);
     if (!report_decision(step)) return LA_FAILED;
     if (step.decision > LA_BUILD_UNDECIDED) {
       if (!run_netlister(step, directory, options, top)) return LA_FAILED;
@@ -473,6 +485,22 @@ void LA_LAUNCHER::set_options(la_command_options& options) const {
   }
 }
 
+/// Compares the rule's dependency files, which lie beside the source, with the output.
+LA_BUILD_DECISION LA_LAUNCHER::decide_by_dependency_files(build_step& step) {
+  if (!step.rule->has_dependency_files()) return LA_BUILD_UP_TO_DATE;
+  for (const LA_FILE* dependency : *step.rule->dependency_files) {
+    LA_FULLFILE file(step.source);
+    if (dependency->get_ext() != nullptr) file.set_ext(dependency->get_ext());
+    if (dependency->get_name() != nullptr) file.set_name(dependency->get_name());
+    const Port::FileStatus status = status_of(file);
+    if (!status.exists || status.time <= step.output_status.time) continue;
+    step.dependency = file.get_fullfile();
+    step.dependency_status = status;
+    return LA_BUILD_OUT_OF_DATE;
+  }
+  return LA_BUILD_UP_TO_DATE;
+}
+
 /// Decides whether the step's netlister must run.
 void LA_LAUNCHER::decide(build_step& step) const {
   const LA_RULE& rule = *step.rule;
@@ -496,8 +524,16 @@ void LA_LAUNCHER::decide(build_step& step) const {
   } else if (step.input_status->time > step.output_status.time) {
     step.decision = LA_BUILD_OUT_OF_DATE;
   } else {
-    step.decision = decide_by_dependency_files(rule, step.source, step.output_status.time);
+    step.decision = decide_by_dependency_files(step);
   }
+}
+
+/// Adds the step to the explanation.
+void LA_LAUNCHER::note(const build_step& step) const {
+  if (explanation == nullptr) return;
+  explanation->steps.push_back({step.rule, step.input.get_fullfile(), step.output.get_fullfile(),
+                                step.input_status.value_or(Port::FileStatus()), step.output_status,
+                                step.dependency, step.dependency_status, step.decision, ""});
 }
 
 /// Reports the decision. False when it ends the chain.
@@ -546,6 +582,7 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& direc
   std::string command;
   if (!make_command(step, options, top, command)) return false;
   message().issueStatus("Launcher: Executing %s\n", command.c_str());
+  if (explanation != nullptr) explanation->steps.back().command = command;
   if (Port_Env::GetEnv("LA_TEST") != nullptr) return true;
   const Port::FileStatus before = status_of(step.output);
   if (execute(*step.rule, command)) return true;
@@ -644,7 +681,14 @@ bool LA_LAUNCHER::make_command(const build_step& step, la_command_options& optio
 /// Runs a command line and judges its exit code by the rule.
 bool LA_LAUNCHER::execute(const LA_RULE& rule, const std::string& command) {
   La_Port_Process process(2);
-  if (process.Run(command.c_str()) != Port_Process::PROCESS_ENDED) {
+  const Port_Process::PROCESS_STATUS status = process.Run(command.c_str());
+  if (Port_Interrupt::Requested() != 0) {
+    // Whatever its exit code says: it may have been cut short.
+    message().issueError("Launcher: %s was interrupted.\n", rule.netlister.get());
+    ++errors;
+    return false;
+  }
+  if (status != Port_Process::PROCESS_ENDED) {
     message().issueError("Failed to launch program %z\n", process.GetProcessErrmsg());
     ++errors;
     return false;

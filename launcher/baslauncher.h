@@ -9,6 +9,7 @@
 #include "host/port_process.h"
 #include "host/ut_darray.h"
 #include "host/ut_str.h"
+#include "launcher/explanation.h"
 
 class LA_RULE;
 class LA_RULE_SET;
@@ -74,6 +75,9 @@ class LA_LAUNCHER {
   /// relative to the current directory of this moment. More than 32767 in all are refused, with an
   /// error message.
   void add_searchpaths(const char** searchpaths, short num_searchpaths);
+  /// From now on find adds what it sees and decides to this object, which stays the caller's; null
+  /// ends that.
+  void explain_to(LA_EXPLANATION* to) { explanation = to; }
 
   /// 1 when the rules were loaded and passed their checks.
   unsigned char ok = 0;
@@ -94,10 +98,12 @@ class LA_LAUNCHER {
   short find_native(const LA_FULLFILE& given, bool named_kbc, LA_FULLFILE& source,
                     char* netlist_path);
   bool find_file(const LA_FULLFILE& given, LA_FULLFILE& found);
+  void note(const LA_FULLFILE& file, LA_EXPLANATION::SIGHTING sighting) const;
   unsigned char find_in_searchpaths(const LA_FULLFILE& given, LA_FULLFILE& found);
 
   short plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted, unsigned char* visited,
                    LA_FULLFILE& source, DARRAY_LA_RULE_CONST_PTR& chain);
+  void note(int rule, LA_EXPLANATION::VERDICT verdict) const;
   bool find_input(const LA_FULLFILE& given, const LA_RULE& rule, LA_FULLFILE& source);
   void report_loop(const unsigned char* visited);
 
@@ -107,6 +113,8 @@ class LA_LAUNCHER {
                     unsigned char top, char* netlist_path);
   void set_options(la_command_options& options) const;
   void decide(build_step& step) const;
+  static LA_BUILD_DECISION decide_by_dependency_files(build_step& step);
+  void note(const build_step& step) const;
   bool report_decision(const build_step& step);
   bool run_netlister(const build_step& step, working_directory& directory,
                      la_command_options& options, unsigned char top);
@@ -132,6 +140,7 @@ class LA_LAUNCHER {
   LA_FULLFILE named_file;
   std::unique_ptr<LA_RULE_SET> rules;
   std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions
+  LA_EXPLANATION* explanation = nullptr;
 };
 
 #endif

@@ -23,22 +23,25 @@ void la_command_options::set_keyword(const char* keyword, const char* value) {
 
 void la_command_options::set_name(const char* keyword, const std::string& name) {
   real_.set_keyword(keyword, name.c_str());
-  plain_.set_keyword(keyword, stand_in_for(name).c_str());
+  // A later name takes the place of the one before: a chain may have many steps.
+  const std::size_t number = numbers_.try_emplace(keyword, names_.size()).first->second;
+  plain_.set_keyword(keyword, stand_in_for(name, number).c_str());
 }
 
 void la_command_options::add_name(const char* keyword, const std::string& name) {
   real_.add_keyword(keyword, name.c_str());
-  plain_.add_keyword(keyword, stand_in_for(name).c_str());
+  plain_.add_keyword(keyword, stand_in_for(name, names_.size()).c_str());
 }
 
-std::string la_command_options::stand_in_for(const std::string& name) {
+std::string la_command_options::stand_in_for(const std::string& name, std::size_t number) {
   const bool is_quoted = name.size() >= 2 && name.front() == '"' && name.back() == '"';
   // The template language drops blanks at the front of a value where there are blanks already.
   const std::size_t start = is_quoted ? 1 : std::min(name.find_first_not_of(' '), name.size());
   const std::size_t end = name.size() - (is_quoted ? 1 : 0);
+  names_.resize(std::max(names_.size(), number + 1));
+  names_[number] = name.substr(start, end - start);
   if (start == end && !is_quoted) return "";
-  std::string text = stand_in(names_.size());
-  names_.push_back(name.substr(start, end - start));
+  std::string text = stand_in(number);
   if (is_quoted) {
     text.insert(text.begin(), '"');
     text.push_back('"');

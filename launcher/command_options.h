@@ -2,10 +2,17 @@
 #ifndef KESTREL_LAUNCHER_COMMAND_OPTIONS_H
 #define KESTREL_LAUNCHER_COMMAND_OPTIONS_H
 
+#include <array>
+#include <map>
 #include <string>
 #include <vector>
 
 #include "optparse/baslaoptparse.h"
+
+/// The keywords that a launcher defines.
+inline constexpr std::array LA_OPTION_KEYWORDS = {
+    "part",        "family",   "device", "pkg", "speed",  "infile",   "outfile",
+    "ignore_locs", "add_pads", "quiet",  "aul", "OUTPUT", "libraries"};
 
 /// The keywords of a chain. Those whose values are names of files or directories are kept twice:
 /// as they are, and as stand-ins, which mean nothing in a command line. A template expanded with
@@ -28,12 +35,13 @@ class la_command_options {
                            const std::string& command) const;
 
  private:
-  std::string stand_in_for(const std::string& name);
+  std::string stand_in_for(const std::string& name, std::size_t number);
   std::string with_names(std::string word) const;
 
   LA_KEYWORD_TABLE real_;
   LA_KEYWORD_TABLE plain_;
-  std::vector<std::string> names_;  ///< by the number in their stand-in
+  std::vector<std::string> names_;              ///< by the number in their stand-in
+  std::map<std::string, std::size_t> numbers_;  ///< of keywords with one name
 };
 
 #endif

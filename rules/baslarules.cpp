@@ -428,6 +428,14 @@ constexpr short NUM_FIELDS = std::size(FIELDS);
 
 }  // namespace
 
+std::vector<const char*> rule_keywords() {
+  std::vector<const char*> keywords = {"RuleName"};
+  for (const rule_field& field : FIELDS) {
+    if (field.store != nullptr) keywords.push_back(field.keyword);
+  }
+  return keywords;
+}
+
 // ---- User rules file ----
 
 namespace {
@@ -541,17 +549,19 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
   const char* full_name = file.get_fullfile();
   if (full_name == nullptr && file.get_name() != nullptr) {
     message().issueError(
-        "Launcher: User rules file \"%s\" has no full name of at most %d characters.\n", file_name,
-        LA_MAX_PATH - 1);
+        "Launcher: User rules file \"%s\" has no full name of at most %d characters, or the "
+        "current "
+        "directory cannot be used.\n",
+        file_name, LA_MAX_PATH - 1);
     return false;
   }
-  if (!file.exists()) {
+  if (full_name == nullptr || Port::File::missing(full_name)) {
     message().issueError("Launcher: User rules file \"%s\" does not exist.\n",
                          full_name != nullptr ? full_name : file_name);
     return false;
   }
   std::unique_ptr<Port::Stream, close_stream> stream(
-      Port::File::open(file.get_fullfile(), Port::Stream::READ, true));
+      Port::File::open(full_name, Port::Stream::READ, true));
   if (!stream) {
     message().issueError("Launcher: Could not open user rules file \"%s\".\n", file_name);
     return false;
@@ -559,6 +569,7 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
   user_rules_loader loader(file_name, *stream);
   const bool good = loader.read() && loader.validate();
   loader.move_to(rules);
+  add_file(file.get_fullfile());
   return good;
 }
 
@@ -700,7 +711,15 @@ bool LA_RULE_SET::load_system_rules(const char* part_name) {
   system_rules_loader loader(path.c_str());
   if (!loader.read() || !loader.validate()) return false;
   loader.move_to(rules);
+  add_file(path);
   return true;
+}
+
+/// The rules that no file before has are those of this one.
+void LA_RULE_SET::add_file(const std::string& path) {
+  int num_before = 0;
+  for (const LA_RULES_FILE& file : files) num_before += file.num_rules;
+  files.push_back({path, rules.count - num_before});
 }
 
 // ---- Rule set ----

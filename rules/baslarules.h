@@ -4,6 +4,8 @@
 #define KESTREL_RULES_BASLARULES_H
 
 #include <memory>
+#include <string>
+#include <vector>
 
 #include "file/baslafile.h"
 #include "host/ut_darray.h"
@@ -127,6 +129,15 @@ using DARRAY_LA_RULE_PTR = UT_TYPED_DARRAY<LA_RULE*>;
 /// Returns whether there was no error. Changes nothing.
 bool validate_rules(const DARRAY_LA_RULE_PTR& batch);
 
+/// The keywords of a user rules file.
+std::vector<const char*> rule_keywords();
+
+/// A file that rules come from.
+struct LA_RULES_FILE {
+  std::string path;
+  int num_rules;
+};
+
 /// The rules of a launcher, in the order of precedence: those of the user rules file (rules for
 /// named files first), those of the device's family, the default ones. It owns them.
 class LA_RULE_SET {
@@ -144,8 +155,11 @@ class LA_RULE_SET {
   /// 1 when every load step and the check succeeded. When it is 0 the rules may be incomplete.
   unsigned char is_valid = 0;
   DARRAY_LA_RULE_PTR rules;
+  /// Where the rules come from, in their order.
+  std::vector<LA_RULES_FILE> files;
 
  private:
+  void add_file(const std::string& path);
   bool load(const char* part_name, const char* user_rules_file);
   bool load_user_rules(const char* file_name);
   bool load_system_rules(const char* part_name);

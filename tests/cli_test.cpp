@@ -75,12 +75,12 @@ TEST_F(Command, PrintsJson) {
 
 TEST_F(Command, ChecksAndShowsTheRules) {
   check(R"(
---check             | 0 | Rules checked: 3, all good\n |
---check --json e    | 0 | {"ok":true,"errors":0,"warnings":0}\n |
+--check             | 0 | Rules checked: 3, all good\n | kestrel-launch: hint: rule b: its options name neither $infile nor $outfile\nkestrel-launch: hint: rule c: its options name neither $infile nor $outfile\n
+--check --json e    | 0 | {"ok":true,"errors":0,"warnings":0}\n | kestrel-launch: hint: rule b: its options name neither $infile nor $outfile\nkestrel-launch: hint: rule c: its options name neither $infile nor $outfile\n
 --check --json -u x | 2 | {"ok":false,"errors":0,"warnings":0}\n | ERROR: Launcher: User rules file "~/x.urf" does not exist.\n
 --check -p NX9      | 2 |  | ERROR: Launcher: NX9 is not a valid PM name.\n
 -u bad e            | 2 |  | ERROR: Launcher: "bad", line 2: Unexpected key word Nonsense\n
---graph             | 0 | digraph rules {\n  rankdir=LR;\n  node [shape=box, style=rounded, fontname="Helvetica"];\n  edge [fontname="Helvetica", fontsize=10];\n  ".edf" -> ".kbo" [label="a\nnl"];\n  ".vhd" -> ".edf" [label="b for top\nnl"];\n  ".v" -> ".edf" [label="c\nnl"];\n}\n |
+--graph             | 0 | digraph rules {\n  rankdir=LR;\n  node [shape=box, style=rounded, fontname="Helvetica"];\n  edge [fontname="Helvetica", fontsize=10];\n  graph [fontname="Helvetica", fontsize=10, label="solid: data/larules.acd\n"];\n  ".edf" -> ".kbo" [label="a\nnl", style=solid];\n  ".vhd" -> ".edf" [label="b for top\nnl", style=solid];\n  ".v" -> ".edf" [label="c\nnl", style=solid];\n}\n |
 --list-rules -u own | 0 | Rule u: .edf => .kbo  nl mine\nRule a: .edf => .kbo  nl out=ran [$ignore_locs] [$add_pads] [$quiet] [$aul] {$libraries }$infile\nRule b: top.vhd => .edf  nl \nRule c: .v => .edf  nl exit=1\n |
 )");
   // A user rule keeps what it says, and has the rest from the rule that it stands before.
@@ -120,7 +120,7 @@ TEST_F(Command, HelpsWithEveryOption) {
     EXPECT_LT(at, help.find(std::string("  ") + o.help + "\n", at)) << line;
   }
   EXPECT_EQ(run({KESTREL_LAUNCH, "e", "-h"}).out, help);
-  EXPECT_TRUE(run({KESTREL_LAUNCH, "-V"}).out.starts_with("kestrel-launch 0.9"));
+  EXPECT_TRUE(run({KESTREL_LAUNCH, "-V"}).out.starts_with("kestrel-launch 1.0.0"));
 }
 
 TEST_F(Command, FailsWhereItCannotWrite) {

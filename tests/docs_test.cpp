@@ -1,22 +1,21 @@
 // The guides hold to what the system does: docs/rules.md shows what its samples really give, and
-// the man page names exactly the options that there are.
+// the man pages name the options and the keywords that there are.
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <iterator>
 #include <regex>
 #include <sstream>
 #include <utility>
 
 #include "cli/settings.h"
+#include "launcher/command_options.h"
 #include "optparse/baslaoptparse.h"
+#include "rules/baslarules.h"
 #include "support.h"
 
 namespace {
 
 std::string guide(const std::string& name) {
-  std::ifstream in(KESTREL_SOURCE_DIR "/docs/" + name);
-  return {std::istreambuf_iterator<char>(in), {}};
+  return slurp(KESTREL_SOURCE_DIR "/docs/" + name);
 }
 
 /// Runs the samples of a guide one after the other; each finds what those before it have left.
@@ -33,14 +32,14 @@ struct Samples {
     std::istringstream lines(kind == "messages" ? "" : text);
     for (std::string line; std::getline(lines, line);) {
       if (kind == "templates") result += expand(line);
-      if (kind == "console" && line[0] == '$') result += line + "\n" + output_of(line.substr(1));
+      if (kind == "console" && line[0] == '$') result += line + "\n" + tree.shell(line.substr(1));
     }
     return result;
   }
   std::string load(const std::string& path, const std::string& kind, const std::string& text) {
     const std::string before = tree.read(path);
     tree.write(path, text);
-    findings = output_of("kestrel-launch --check -u sample.urf >/dev/null");
+    findings = tree.shell("kestrel-launch --check -u sample.urf 2>&1 >/dev/null | grep -v hint:");
     EXPECT_EQ(!findings.empty(), kind.ends_with("-error")) << text;
     if (!findings.empty()) tree.write(path, before);
     return text;
@@ -58,9 +57,6 @@ struct Samples {
     line.copy(options, line.rfind('"', arrow) - 1, 1);
     if (table.expand(options)) return line.substr(0, arrow + 4) + "\"" + options + "\"\n";
     return line.substr(0, arrow + 4) + "error: " + messages.take().erase(0, 2);
-  }
-  std::string output_of(const std::string& line) const {
-    return tree.shorten(run({"sh", "-c", "exec 2>&1; PATH=" KESTREL_BIN_DIR ":$PATH;" + line}).out);
   }
 
   Tree tree;
@@ -80,6 +76,11 @@ TEST(Docs, SamplesGiveWhatTheGuideShows) {
   EXPECT_EQ(samples.findings, "");
 }
 
+/// A list of the page has an item like this regular expression.
+void expect_item(const std::string& page, const std::string& item) {
+  EXPECT_TRUE(std::regex_search(page, std::regex("\n\\.T[PQ]\n" + item + "[\\\\\n]"))) << item;
+}
+
 TEST(Docs, ManPageNamesTheOptionsThatThereAre) {
   const std::string page =
       std::regex_replace(guide("kestrel-launch.1"), std::regex("\\\\(f.|(?=-))"), "");
@@ -88,12 +89,18 @@ TEST(Docs, ManPageNamesTheOptionsThatThereAre) {
     std::string item = o.short_name != nullptr ? o.short_name + std::string(", ") : "";
     item.append(o.long_name).append(o.argument != nullptr ? " " : "");
     if (o.argument != nullptr) item += o.argument;
-    EXPECT_NE(page.find("\n.TP\n" + item + "\n"), page.npos) << item;
+    expect_item(page, item);
   }
   const std::regex long_name("--[a-z-]+");
   for (std::sregex_iterator at(page.begin(), page.end(), long_name), end; at != end; ++at) {
     EXPECT_NE(help.find(at->str() + " "), help.npos) << at->str();
   }
+}
+
+TEST(Docs, ManPageOfRulesNamesTheKeywordsThatThereAre) {
+  const std::string page = guide("kestrel-rules.5");
+  for (const char* word : rule_keywords()) expect_item(page, R"(.*\\fB)" + std::string(word));
+  for (const char* word : LA_OPTION_KEYWORDS) expect_item(page, R"(.*\\fB\$)" + std::string(word));
 }
 
 }  // namespace

@@ -7,15 +7,21 @@
 //   leave=N     leaves a process behind that holds the output open for N seconds
 //   close       closes standard output and error
 //   sleep=N     sleeps for N milliseconds
+//   trap=N      ends with exit code 0 when signal N comes
+//   defy=N      writes the file "defied" when signal N comes, and goes on
+//   signals     writes which signals are blocked and which are ignored
 // Any other argument does nothing.
+#include <fcntl.h>
 #include <signal.h>
 #include <unistd.h>
 
+#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <string>
+#include <thread>
 #include <vector>
 
 namespace {
@@ -28,6 +34,15 @@ std::string all(const std::vector<std::string>& words) {
 
 void write_to(int descriptor, const std::string& text) {
   if (::write(descriptor, text.data(), text.size()) < 0) std::exit(99);
+}
+
+std::string signal_state() {
+  std::ifstream status("/proc/self/status");
+  std::string state;
+  for (std::string line; std::getline(status, line);) {
+    if (line.starts_with("SigBlk") || line.starts_with("SigIgn")) state += line + "\n";
+  }
+  return state;
 }
 
 void leave_behind(unsigned int seconds) {
@@ -47,8 +62,11 @@ void carry_out(const std::string& verb, const std::string& value,
   if (verb == "exit") std::exit(number);
   if (verb == "kill") ::raise(number);
   if (verb == "leave") leave_behind(static_cast<unsigned int>(number));
+  if (verb == "trap") ::signal(number, [](int) { ::_exit(0); });
+  if (verb == "defy") ::signal(number, [](int) { ::close(::creat("defied", 0600)); });
+  if (verb == "signals") write_to(1, signal_state());
   if (verb == "close") ::close(1), ::close(2);
-  if (verb == "sleep") ::usleep(static_cast<useconds_t>(number) * 1000);
+  if (verb == "sleep") std::this_thread::sleep_for(std::chrono::milliseconds(number));
 }
 
 }  // namespace

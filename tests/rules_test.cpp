@@ -1,5 +1,4 @@
 // Rules: their records, both kinds of rules files, validation and inheritance.
-#include <sys/stat.h>
 
 #include <algorithm>
 #include <random>
@@ -129,21 +128,15 @@ TEST_F(Rules, UserFileLimits) {
   EXPECT_EQ(reads(value + "\";").substr(0, 268), "r,.a,.k," + std::string(259, 'x') + ",");
   EXPECT_EQ(reads(replaced(value, "Netlister", "RuleName") + "x\nx\"; @s"),
             "2: Value is longer than 259 characters\n(2)");
-  EXPECT_EQ(reads(std::string(32766, '\n') + "@r"), "r@;");
-  EXPECT_EQ(reads(std::string(32767, '\n') + "@r"), "32767: File has more than 32767 lines\n(0)");
   EXPECT_EQ(reads("@r\n" + std::string(2, '\0') + "\n@s"), "2: Line holds a zero byte\n(2)");
 }
 
 TEST_F(Rules, UserFileNames) {
   write_rules("@r");
   tree.write("a.txt", tree.read("u.urf"));
-  tree.make("d.urf/");
-  ::mkfifo("p.urf", 0600);
   expect_table([this](const std::string& name) { return loaded(nullptr, name.c_str()); }, R"(
 u     | r@;
-a.txt | r@;
-d     | User rules file "~/d.urf" does not exist.\n(0)
-p     | Could not open user rules file "p".\n(0))");
+a.txt | r@;)");
   const std::string name(260, 'x');
   EXPECT_EQ(loaded(nullptr, name.c_str()).find(name + "\" is longer than 259 characters"), 22);
 }

@@ -73,6 +73,9 @@ class Tree {
   std::string expand(std::string text) const;
   /// text with every occurrence of the tree's directory replaced by "~".
   std::string shorten(std::string text) const;
+  /// Runs shell commands, with the command that is tested on PATH. Tells what they print,
+  /// shortened.
+  std::string shell(const std::string& commands) const;
 
   std::string home;
 
@@ -89,8 +92,10 @@ struct Ran {
 };
 
 /// Runs a program in the current directory, with nothing on its standard input unless some is
-/// given.
-Ran run(const std::vector<std::string>& words, const std::string& input = "");
+/// given. meanwhile is called with its number, which is also that of a process group.
+Ran run(
+    const std::vector<std::string>& words, const std::string& input = "",
+    const std::function<void(pid_t)>& meanwhile = [](pid_t) {});
 
 /// The content of a file.
 std::string slurp(const std::string& path);

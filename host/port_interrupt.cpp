@@ -1,0 +1,99 @@
+#include "host/port_interrupt.h"
+
+#include <signal.h>
+#include <sys/wait.h>
+#include <time.h>
+
+#include <atomic>
+#include <cerrno>
+
+namespace {
+
+// A signal handler works on these, at any moment.
+std::atomic<int> requests = 0;
+std::atomic<int> first_signal = 0;
+std::atomic<int> passed_on = 0;  ///< how many of the requests the running child has got
+std::atomic<pid_t> running = 0;  ///< a process, minus a process group, or 0
+std::atomic<bool> groups = false;
+static_assert(std::atomic<int>::is_always_lock_free && std::atomic<bool>::is_always_lock_free);
+
+/// Sends the child what it has not got yet. A handler calls this in the midst of anything, also of
+/// itself: whoever raises passed_on does the sending, so that no request is sent twice.
+void pass_on_requests() {
+  const int number = requests;
+  const pid_t target = running;
+  if (target == 0 || passed_on.exchange(number) >= number) return;
+  ::kill(target, number == 1 ? first_signal.load() : SIGKILL);
+  // A stopped process does not notice before it goes on.
+  ::kill(target, SIGCONT);
+}
+
+/// Waits for a process group to empty, for a second at the most.
+bool is_gone(pid_t group) {
+  constexpr timespec MOMENT = {0, 10'000'000};
+  for (int i = 0; i < 100; ++i) {
+    // Members that nobody reaps stay in the group. Where orphans come to this process, it does.
+    while (::waitpid(-group, nullptr, WNOHANG) > 0) {
+    }
+    if (::kill(-group, 0) != 0) return true;
+    ::nanosleep(&MOMENT, nullptr);
+  }
+  return false;
+}
+
+}  // namespace
+
+void Port_Interrupt::Request(int signal) {
+  const int error = errno;
+  int none = 0;
+  first_signal.compare_exchange_strong(none, signal);
+  ++requests;
+  pass_on_requests();
+  errno = error;
+}
+
+int Port_Interrupt::Requested() {
+  return first_signal;
+}
+
+void Port_Interrupt::Clear() {
+  requests = 0;
+  first_signal = 0;
+}
+
+void Port_Interrupt::SetOwnGroups(bool own) {
+  groups = own;
+}
+
+void Port_Interrupt::PassOn(int signal) {
+  const int error = errno;
+  const pid_t target = running;
+  if (target != 0) ::kill(target, signal);
+  errno = error;
+}
+
+bool Port_Interrupt::own_groups() {
+  return groups;
+}
+
+/// Requests go to this child now, also one that came while it was started.
+void Port_Interrupt::child_started(pid_t child) {
+  passed_on = 0;
+  running = groups ? -child : child;
+  pass_on_requests();
+}
+
+/// To be called before the child is reaped: its number may be that of another process then. That
+/// of a group stays as long as the group has members.
+void Port_Interrupt::child_ended() {
+  if (!groups) running = 0;
+}
+
+/// Ends what an interrupted child has left in its group.
+void Port_Interrupt::child_reaped(pid_t child) {
+  if (groups && Requested() != 0 && !is_gone(child)) {
+    ::kill(-child, SIGKILL);
+    is_gone(child);
+  }
+  running = 0;
+}

@@ -1,0 +1,174 @@
+// The launcher as a guest of its process: what it leaves as it was, and how it is interrupted.
+#include <gtest/gtest.h>
+#include <poll.h>
+#include <signal.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <clocale>
+#include <filesystem>
+#include <set>
+
+#include "host/port_interrupt.h"
+#include "launcher/baslauncher.h"
+#include "support.h"
+
+namespace fs = std::filesystem;
+
+namespace {
+
+/// What a guest must leave as it is.
+std::string process_state() {
+  std::string state = fs::current_path().string() + " " + std::setlocale(LC_ALL, nullptr);
+  for (char** variable = environ; *variable != nullptr; ++variable)
+    state += "\n" + std::string(*variable);
+  sigset_t mask;
+  ::sigprocmask(SIG_BLOCK, nullptr, &mask);
+  for (int number = 1; number < NSIG; ++number) {
+    struct sigaction action = {};
+    ::sigaction(number, nullptr, &action);
+    state += "\n" + testing::PrintToString(action.sa_handler) +
+             std::to_string(::sigismember(&mask, number));
+  }
+  std::set<std::string> files;
+  for (const auto& file : fs::directory_iterator("/proc/self/fd")) {
+    std::error_code gone;  // the descriptor of the iteration itself has no place that is the same
+    const fs::path target = fs::read_symlink(file, gone);
+    if (target.string().find("/proc/") == std::string::npos) files.insert(file.path() / target);
+  }
+  const mode_t creation = ::umask(0);
+  ::umask(creation);
+  return state + testing::PrintToString(files) + std::to_string(creation) +
+         std::to_string(::waitpid(-1, nullptr, WNOHANG));
+}
+
+/// A tree whose netlisters do what the library entries say, the last one with its output in place.
+class Guest : public testing::Test {
+ protected:
+  Guest() {
+    fs::create_directory("bin");
+    fs::create_symlink(TEST_NETLISTER, "bin/nl");
+    tree.write("share/data/larules.acd", R"(RULES = a, b, c
+a = .edf,.kbo,,nl,{$libraries }out=$outfile sleep=60000,{$libraries }out=$outfile,,,,0
+b = .sch,.edf,,nl,,out=$outfile,,,,0
+c = .v,.kbo,,missing,,,bin,,,0)");
+    tree.make("d.sch e.v");
+  }
+
+  /// Resolves a name, whatever the time stamps say. Tells all that is said, and the result.
+  std::string find(const char* name, const char* library, bool top = false) {
+    LA_LAUNCHER launcher(nullptr, nullptr, 0, &library, 1, nullptr, nullptr, 1, 0, 0, 0, 0, 0);
+    char source[LA_MAX_PATH];
+    char netlist[LA_MAX_PATH];
+    const short result = launcher.ok ? launcher.find(name, source, netlist, top) : short{-1};
+    return tree.shorten(messages.take()) + std::to_string(result);
+  }
+
+  Tree tree;
+  Variable path = {"PATH", tree.full("bin").c_str()};
+  Messages messages;
+};
+
+void interrupt(void* self, const Port_Msg& message) {
+  static_cast<Messages*>(self)->records.push_back({message.level, "", message.text});
+  if (std::string(message.text) == "now\n") Port_Interrupt::Request(SIGTERM);
+}
+
+}  // namespace
+
+TEST_F(Guest, LeavesItsProcessAsItWas) {
+  const std::string first = "S Launcher: Executing nl out=\"d.edf\"\nS Launcher: Executing nl ";
+  const std::string failed = "E Failed to launch program ";
+  const std::string none = "0000000000000000\n";
+  sigset_t all, before;
+  ::sigfillset(&all);
+  for (const auto& handler : {SIG_DFL, SIG_IGN, +[](int) {}}) {
+    for (const int number : {SIGCHLD, SIGUSR1, SIGPIPE}) ::signal(number, handler);
+    ::sigprocmask(SIG_SETMASK, &all, &before);
+    const std::string state = process_state();
+    EXPECT_EQ(find("d", "signals"),
+              first + "signals out=\"d.kbo\"\nS SigBlk:\t" + none + "S SigIgn:\t" + none + "0");
+    EXPECT_EQ(find("d", "exit=3"),
+              first + "exit=3 out=\"d.kbo\"\nE nl exited with errors (return code 3).\n-1");
+    EXPECT_EQ(find("e", ""), "S Launcher: Executing missing \n" + failed +
+                                 "missing: No such file or directory\n-1");
+    EXPECT_EQ(find("f", ""), "1");
+    EXPECT_EQ(process_state(), state);
+    ::sigprocmask(SIG_SETMASK, &before, nullptr);
+    for (const int number : {SIGCHLD, SIGUSR1, SIGPIPE}) ::signal(number, SIG_DFL);
+  }
+}
+
+TEST_F(Guest, FailsCleanlyWithoutDescriptors) {
+  const std::string good = find("d", "");
+  rlimit limit;
+  ::getrlimit(RLIMIT_NOFILE, &limit);
+  const std::string state = process_state();
+  const int next = ::dup(0);
+  ::close(next);
+  std::string found;
+  for (unsigned free = 0; found != good && free < 20; ++free) {
+    const rlimit few = {static_cast<rlim_t>(next) + free, limit.rlim_max};
+    ::setrlimit(RLIMIT_NOFILE, &few);
+    found = find("d", "");
+    ::setrlimit(RLIMIT_NOFILE, &limit);
+    EXPECT_TRUE(found == good || found.find(" open ") != found.npos) << found;
+    EXPECT_EQ(process_state(), state) << free;
+  }
+  EXPECT_EQ(found, good);
+}
+
+TEST_F(Guest, IsInterruptedByItsHost) {
+  const std::string start =
+      "S Launcher: Executing nl out=\"d.edf\"\nE Launcher: nl was interrupted.\n-1";
+  const Port_MsgSink before = Port_MsgManData::setSink({interrupt, &messages, false});
+  const std::string state = process_state();
+  const std::string interrupted = replaced(
+      start, "E ", "S Launcher: Executing nl say=now out=\"d.kbo\" sleep=60000\nS now\nE ");
+  EXPECT_EQ(find("d", "say=now", true), interrupted);
+  EXPECT_EQ(find("d", ""), start);
+  EXPECT_EQ(Port_Interrupt::Requested(), SIGTERM);
+  Port_Interrupt::Clear();
+  EXPECT_TRUE(find("d", "").ends_with("0"));
+  EXPECT_EQ(process_state(), state);
+  Port_MsgManData::setSink(before);
+}
+
+// The signals come when the last netlister of a chain has begun to write its output.
+TEST_F(Guest, AnInterruptedCommandEndsWhatItStarted) {
+  for (const int number : {SIGINT, SIGTERM, SIGHUP, SIGQUIT}) ::signal(number, SIG_DFL);
+  for (const auto& row : table(R"(
+2    | group | quiet
+15   | alone | quiet
+1    | alone | trap=1
+3    | alone | quiet
+2 15 | alone | defy=2
+)")) {
+    tree.remove("d.kbo");
+    int held[2];
+    ASSERT_EQ(::pipe(held), 0);
+    const auto interrupted = [&](pid_t command) {
+      ::close(held[1]);
+      std::istringstream numbers(row[0]);
+      std::string sign = "d.kbo";
+      for (int number; numbers >> number; sign = "defied") {
+        for (int i = 0; i < 20'000 && !tree.exists(sign); ++i) ::usleep(1000);
+        ::kill(row[1] == "group" ? -command : command, number);
+      }
+    };
+    const Ran ran =
+        run({KESTREL_LAUNCH, "-f", "-l", row[2], "-l", "leave=60", "d"}, "", interrupted);
+    EXPECT_EQ(ran.status, 128 + std::stoi(row[0]));
+    EXPECT_EQ(ran.err,
+              "Launcher: Executing nl out=\"d.edf\"\nLauncher: Executing nl " + row[2] +
+                  " leave=60 out=\"d.kbo\" sleep=60000\nERROR: Launcher: nl was interrupted.\n");
+    // Nobody is left who holds the other end.
+    pollfd event = {held[0], POLLIN, 0};
+    EXPECT_EQ(::poll(&event, 1, 0), 1) << row[0];
+    ::close(held[0]);
+    EXPECT_EQ(run({KESTREL_LAUNCH, "--not-top", "d"}).err,
+              "Launcher: d.edf is up to date\nLauncher: Executing nl out=\"d.kbo\"\n");
+  }
+}
