@@ -3,17 +3,19 @@
 # make bench   set up, build, measure; make bench ROWS="1 3" QUICK=1
 BUILD ?= build
 JOBS ?= $(shell nproc)
+SECONDS ?= 60
 
 BUILD_PACKAGES = g++ cmake make
 TEST_PACKAGES = $(BUILD_PACKAGES) libgtest-dev man-db pkgconf
 DEMO_PACKAGES = $(BUILD_PACKAGES) yosys
+FUZZ_PACKAGES = $(TEST_PACKAGES) clang-14 libclang-rt-14-dev
 PACKAGE_PACKAGES = $(BUILD_PACKAGES) dpkg-dev file
 BENCH_PACKAGES = $(BUILD_PACKAGES) ninja-build python3 strace valgrind
 COOKBOOK_PACKAGES = $(BUILD_PACKAGES) python3 yosys nextpnr-ice40 fpga-icestorm lepton-eda \
   berkeley-abc m4 zip unzip
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo cookbook test bench sanitize lint package clean help
+.PHONY: all build demo cookbook test bench sanitize fuzz lint package clean help
 
 all: build
 
@@ -56,6 +58,13 @@ sanitize:
 	@cd $(BUILD)-sanitize && ctest --output-on-failure --parallel $(JOBS)
 	@echo "All tests passed under AddressSanitizer and UndefinedBehaviorSanitizer."
 
+# Looks for inputs for which something does not hold, for so many seconds in each target.
+fuzz:
+	@tools/setup $(FUZZ_PACKAGES)
+	@cmake --preset fuzz -B $(BUILD)-fuzz >/dev/null
+	@cmake --build $(BUILD)-fuzz --parallel $(JOBS) --target fuzz-targets
+	@tools/fuzz $(BUILD)-fuzz $(SECONDS)
+
 # The formatter and the linter, which must have nothing to say.
 lint:
 	@tools/setup $(LINT_PACKAGES) $(TEST_PACKAGES)
@@ -78,6 +87,7 @@ help:
 	@echo "make test      set up, build, and pass all tests"
 	@echo "make bench     measure the launcher beside make and ninja; ROWS=\"1 3\" QUICK=1"
 	@echo "make sanitize  pass all tests under the sanitizers"
+	@echo "make fuzz      look for inputs that break something, for SECONDS=$(SECONDS) in each target"
 	@echo "make lint      check format and code with clang's tools"
 	@echo "make package   make Debian packages"
 	@echo "make clean     remove what was built"

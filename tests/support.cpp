@@ -179,7 +179,7 @@ std::string shown(std::initializer_list<const char*> texts) {
   return all.substr(1);
 }
 
-int main(int count, char** words) {
+void fix_environment() {
   for (const char* name : {"LAUNCHER_DETAIL", "LA_DISABLE", "LA_TEST", "MYCORVANE", "CORVANE",
                            "CVN_KESTREL_ALLOW_PLF", "NO_COLOR"}) {
     ::unsetenv(name);
@@ -187,6 +187,4 @@ int main(int count, char** words) {
   ::setenv("LC_ALL", "C", 1);
   ::setenv("TZ", "UTC", 1);
   ::setenv("PATH", "/usr/bin:/bin", 1);
-  ::testing::InitGoogleTest(&count, words);
-  return RUN_ALL_TESTS();
 }

@@ -11,6 +11,9 @@
 
 #include "host/port_msgman.h"
 
+/// Sets or removes every environment variable that counts.
+void fix_environment();
+
 /// Records all messages while it lives.
 class Messages {
  public:
@@ -96,6 +99,7 @@ Ran run(
 
 /// The content of a file.
 std::string slurp(const std::string& path);
+
 /// text with every occurrence of from replaced by to.
 std::string replaced(std::string text, const std::string& from, const std::string& to);
 
