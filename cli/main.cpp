@@ -82,6 +82,7 @@ void print_totals(bool ok, int errors, int warnings) {
 
 void print_result(const settings& set, const std::string& name, short result, const char* source,
                   const char* netlist) {
+  console::flush();
   if (set.json) {
     std::printf("{\"name\":%s,\"result\":%d,\"source\":%s,\"netlist\":%s}\n",
                 json_string(name).c_str(), result, json_string(source).c_str(),

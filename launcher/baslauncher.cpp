@@ -44,7 +44,11 @@ std::span<Element> counted(const std::unique_ptr<Element[]>& array, short count)
 }  // namespace
 
 void La_Port_Process::Output(const char* text) {
-  message().issueStatus("%s", text);
+  message().issueStatusText(text);
+}
+
+void La_Port_Process::Pause() {
+  Port_MsgManData::flush();
 }
 
 // ---- The launcher object ----

@@ -30,6 +30,8 @@ class La_Port_Process : public Port_Process {
   explicit La_Port_Process(int mode) : Port_Process(mode) {}
   /// Issues text as a status message, with no regard to any "%" in it.
   void Output(const char* text) override;
+  /// Tells the message manager.
+  void Pause() override;
 };
 
 /// One launcher serves any number of find calls, all from one thread. While a netlister runs, the
