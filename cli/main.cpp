@@ -138,7 +138,8 @@ int resolve(settings& set, const console& shown) {
     char source[LA_MAX_PATH];
     char netlist[LA_MAX_PATH];
     short result = launcher.find(name.c_str(), source, netlist, set.top);
-    if (result == LA_FOUND && !is_dry_run() && !Port::File::exist(netlist)) {
+    if (result == LA_FOUND && !launcher.saw_netlist() && !is_dry_run() &&
+        !Port::File::exist(netlist)) {
       complain(std::string("no netlister has written ") + netlist);
       result = LA_FAILED;
       source[0] = '\0';

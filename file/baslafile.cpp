@@ -1,6 +1,7 @@
 #include "file/baslafile.h"
 
 #include <cstring>
+#include <string_view>
 #include <utility>
 
 #include "host/cvnform.h"
@@ -35,7 +36,7 @@ class la_path_text {
   /// text in the internal form.
   explicit la_path_text(const char* text) : la_path_text() {
     add(text);
-    Port::File::makeunixpath(chars_);
+    if (std::memchr(chars_, '\\', length_) != nullptr) Port::File::makeunixpath(chars_);
   }
 
   /// Appends text; null adds nothing.
@@ -162,7 +163,7 @@ bool la_split_path(const char* path, path_parts& parts) {
 
 /// Resolves "./" and "../", wherever they stand. False when "../" would climb above the first
 /// directory.
-bool normalise(const la_path_text& from, la_path_text& to) {
+bool resolve_dots(const la_path_text& from, la_path_text& to) {
   for (const char* c = from.chars(); *c != '\0';) {
     if (std::strncmp(c, "../", 3) == 0) {
       for (int slashes = 0; slashes < 2; ++slashes) {
@@ -179,6 +180,14 @@ bool normalise(const la_path_text& from, la_path_text& to) {
     }
   }
   return true;
+}
+
+/// Brings a full name into its normal form, where there is one.
+void normalise(la_path_text& text) {
+  const std::string_view chars(text.chars(), text.length());
+  if (chars.find("./") == chars.npos && chars.find('\\') == chars.npos) return;
+  la_path_text normal;
+  if (text.fits() && resolve_dots(la_path_text(text.chars()), normal)) text = normal;
 }
 
 }  // namespace
@@ -449,8 +458,7 @@ const char* LA_FULLFILE::get_fullroot() const {
 void LA_FULLFILE::append_full_name_to(la_path_text& text) const {
   dir->append_to(text);
   file->append_to(text);
-  la_path_text normal;
-  if (text.fits() && normalise(la_path_text(text.chars()), normal)) text = normal;
+  normalise(text);
 }
 
 const char* LA_FULLFILE::get_fullfile() const {
@@ -493,4 +501,29 @@ unsigned char LA_FULLFILE::get_timestamp(__int64& time) const {
 void LA_FULLFILE::dump() const {
   if (dir) dir->dump();
   if (file) file->dump();
+}
+
+LA_FULLROOT::LA_FULLROOT(const LA_DIR& directory, const char* root) {
+  if (directory.dir == nullptr || root == nullptr) return;
+  la_path_text text;
+  directory.append_to(text);
+  text.add(root);
+  if (!text.fits()) return;
+  room = LA_MAX_PATH - text.length();
+  normalise(text);
+  length = text.length();
+  std::memcpy(chars, text.chars(), length);
+}
+
+LA_FULLROOT::LA_FULLROOT(const LA_FULLFILE& file) : LA_FULLROOT(*file.dir, file.get_root()) {}
+
+const char* LA_FULLROOT::with_ext(const char* ext) {
+  const std::size_t added = ext != nullptr ? 1 + std::strlen(ext) : 0;
+  if (added >= room) return nullptr;
+  if (ext != nullptr) {
+    chars[length] = '.';
+    std::memcpy(chars + length + 1, ext, added - 1);
+  }
+  chars[length + added] = '\0';
+  return UT_PATH::ExternalPath(chars);
 }

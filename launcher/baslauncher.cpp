@@ -35,6 +35,14 @@ Port_MsgManData& message(int line = __builtin_LINE()) {
   return Port_MsgManData::createObject("Kestrel", "launcher/baslauncher.cpp", line, revision);
 }
 
+Port::FileStatus status_of(const char* path) {
+  return path != nullptr ? Port::File::status(path) : Port::FileStatus();
+}
+
+Port::FileStatus status_of(const LA_FULLFILE& file) {
+  return status_of(file.get_fullfile());
+}
+
 /// The elements of an array that is kept with its count.
 template <class Element>
 std::span<Element> counted(const std::unique_ptr<Element[]>& array, short count) {
@@ -102,6 +110,7 @@ short LA_LAUNCHER::find(const char* name, char* source_path, char* netlist_path,
                         unsigned char top) {
   source_path[0] = '\0';
   netlist_path[0] = '\0';
+  netlist_seen = false;
   try {
     if (Port_Env::GetEnv("LA_DISABLE") != nullptr) return find_disabled(name, netlist_path);
     return find_enabled(name, source_path, netlist_path, top);
@@ -115,7 +124,7 @@ short LA_LAUNCHER::find(const char* name, char* source_path, char* netlist_path,
 }
 
 /// Looks for the name in lower case, without rules and messages.
-short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) const {
+short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) {
   char lower_name[LA_MAX_PATH];
   if (UT_STR::Copy(lower_name, name) == nullptr) return LA_NOT_FOUND;
   UT_STR::Lower(lower_name);
@@ -125,8 +134,25 @@ short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) const {
   for (const auto& dir : counted(searchpaths, num_searchpaths)) names.emplace_back(dir->get_dir());
   dirs.assign(names.begin(), names.end());
   const char* found = Port::File::find(lower_name, dirs.data(), num_searchpaths, netlist_path);
-  return found != nullptr ? LA_FOUND : LA_NOT_FOUND;
+  netlist_seen = found != nullptr;
+  return netlist_seen ? LA_FOUND : LA_NOT_FOUND;
 }
+
+/// The name that find was given, and where it looks for files of this name.
+struct LA_LAUNCHER::lookup {
+  explicit lookup(const LA_FULLFILE& given) : given(given), beside(given) {}
+
+  /// The file of the given name with another extension.
+  LA_FULLFILE with_ext(const char* ext) const {
+    LA_FULLFILE file(given);
+    file.set_ext(ext);
+    return file;
+  }
+
+  const LA_FULLFILE& given;
+  LA_FULLROOT beside;                       ///< where the name says
+  std::vector<LA_FULLROOT> in_searchpaths;  ///< empty before they are needed
+};
 
 short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
                                 unsigned char top) {
@@ -142,18 +168,18 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
     return LA_FAILED;
   }
 
-  const LA_FILE target(".kbo");
-  LA_FULLFILE source;
+  lookup where(given);
+  found_file source;
   DARRAY_LA_RULE_CONST_PTR chain(3);
-  find_named(given);
+  find_named(where);
   std::vector<unsigned char> visited(static_cast<std::size_t>(rules->rules.count));
-  short result = plan_chain(given, target, visited.data(), source, chain);
+  short result = plan_chain(where, "kbo", visited.data(), source, chain);
   if (result == LA_FOUND) {
     result = build_chain(source, chain, top, netlist_path);
   } else if (result == LA_NOT_FOUND) {
-    result = find_native(given, named_kbc, source, netlist_path);
+    result = find_native(where, named_kbc, source, netlist_path);
   }
-  if (result == LA_FOUND) UT_STR::Copy(source_path, source.get_fullfile());
+  if (result == LA_FOUND) UT_STR::Copy(source_path, source.file.get_fullfile());
   return result;
 }
 
@@ -179,77 +205,83 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
 }
 
 /// Looks for the very file that the user named with an extension.
-void LA_LAUNCHER::find_named(const LA_FULLFILE& given) {
+void LA_LAUNCHER::find_named(lookup& where) {
   named_found = 0;
-  named_file.set_file();
-  if (given.get_ext() == nullptr) return;
-  named_found = find_file(given, named_file);
+  named_file.file.set_file();
+  const char* ext = where.given.get_ext();
+  if (ext == nullptr) return;
+  named_found = find_file(where, ext, named_file);
   if (named_found) return;
   message().issueWarning(
       "Launcher: Could not find file %s with extension %s in the search path. Ignoring "
       "extension.\n",
-      given.get_fullroot(), given.get_ext());
+      where.given.get_fullroot(), ext);
   ++warnings;
 }
 
 /// Looks for a file that needs no rule: .kbo, then .kbc; only .kbc when the user asked for that.
-short LA_LAUNCHER::find_native(const LA_FULLFILE& given, bool named_kbc, LA_FULLFILE& source,
+short LA_LAUNCHER::find_native(lookup& where, bool named_kbc, found_file& source,
                                char* netlist_path) {
-  LA_FULLFILE candidate(given);
-  if (!named_kbc) candidate.set_ext("kbo");
-  bool is_kbo = !named_kbc;
-  if (!find_file(candidate, source)) {
-    candidate.set_ext("kbc");
-    is_kbo = false;
-    if (!find_file(candidate, source)) return LA_NOT_FOUND;
-  }
-  if (is_kbo) {
+  const char* ext = named_kbc ? where.given.get_ext() : "kbo";
+  const bool found_first = find_file(where, ext, source);
+  if (!found_first && !find_file(where, "kbc", source)) return LA_NOT_FOUND;
+  if (found_first && !named_kbc) {
     message().issueStatus("Launcher: NOT compiling %s because its source was not found\n",
-                          candidate.get_tail());
+                          where.with_ext(ext).get_tail());
   }
-  UT_STR::Copy(netlist_path, source.get_fullfile());
+  UT_STR::Copy(netlist_path, source.file.get_fullfile());
+  netlist_seen = true;
   return LA_FOUND;
 }
 
 // ---- Search-path resolution ----
 
 /// Looks where the name says, then in the search directories.
-bool LA_LAUNCHER::find_file(const LA_FULLFILE& given, LA_FULLFILE& found) {
-  const bool exists = given.exists();
-  note(given, exists ? LA_EXPLANATION::FOUND : LA_EXPLANATION::MISSING);
-  if (!exists) return find_in_searchpaths(given, found);
-  found = given;
+bool LA_LAUNCHER::find_file(lookup& where, const char* ext, found_file& found) {
+  const char* path = where.beside.with_ext(ext);
+  const Port::FileStatus status = status_of(path);
+  note(path, status.exists ? LA_EXPLANATION::FOUND : LA_EXPLANATION::MISSING);
+  if (!status.exists) return find_in_searchpaths(where, ext, found);
+  found = {where.with_ext(ext), status};
   return true;
 }
 
 /// Adds a place where a file was looked for to the explanation.
-void LA_LAUNCHER::note(const LA_FULLFILE& file, LA_EXPLANATION::SIGHTING sighting) const {
-  if (explanation == nullptr || file.get_fullfile() == nullptr) return;
-  explanation->probes.push_back({sighting, file.get_fullfile()});
+void LA_LAUNCHER::note(const char* path, LA_EXPLANATION::SIGHTING sighting) const {
+  if (explanation != nullptr && path != nullptr) explanation->probes.push_back({sighting, path});
 }
 
 /// Looks in the search directories. All of them are visited, so that the report on files passed
 /// over is complete. found is written only when there is one.
-unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULLFILE& found) {
-  const la_text file(given.get_file());
+unsigned char LA_LAUNCHER::find_in_searchpaths(lookup& where, const char* ext, found_file& found) {
+  const auto dirs = counted(searchpaths, num_searchpaths);
+  if (where.in_searchpaths.size() < dirs.size()) {
+    // As a head may begin with a drive, which is dropped.
+    const LA_FILE relative(where.with_ext(ext).get_file());
+    where.in_searchpaths.reserve(dirs.size());
+    for (const auto& dir : dirs) where.in_searchpaths.emplace_back(*dir, relative.get_root());
+  }
+  la_text file;
   bool found_any = false;
   Port::StringBase<char> first;
   Port::StringBase<char> others;
-  for (const auto& dir : counted(searchpaths, num_searchpaths)) {
-    const LA_FULLFILE candidate(*dir, file);
-    if (!candidate.exists()) {
-      note(candidate, LA_EXPLANATION::MISSING);
+  for (std::size_t i = 0; i < dirs.size(); ++i) {
+    const char* path = where.in_searchpaths[i].with_ext(ext);
+    const Port::FileStatus status = status_of(path);
+    if (!status.exists) {
+      note(path, LA_EXPLANATION::MISSING);
       continue;
     }
-    const Port::StringBase<char> name(candidate.get_fullfile());
+    const Port::StringBase<char> name(path);
     if (!found_any) {
-      note(candidate, LA_EXPLANATION::FOUND);
-      found = candidate;
+      note(path, LA_EXPLANATION::FOUND);
+      file = where.with_ext(ext).get_file();
+      found = {LA_FULLFILE(*dirs[i], file), status};
       first = name;
       found_any = true;
     } else if (!(name == first) && others.GetIndexOfString(name, Port::StringBase<char>::EXACT) ==
                                        Port::StringBase<char>::NOT_FOUND) {
-      note(candidate, LA_EXPLANATION::PASSED_OVER);
+      note(path, LA_EXPLANATION::PASSED_OVER);
       others += "\t";
       others += name;
       others += "\n";
@@ -275,9 +307,8 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULL
 /// its path, or it would have ended in a loop report. So none of those rules leads to it, from
 /// wherever it is wanted next, and the outcome is again that there is no such file. Only another
 /// spelling of the extension is another file.
-short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
-                              unsigned char* visited, LA_FULLFILE& source,
-                              DARRAY_LA_RULE_CONST_PTR& chain) {
+short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* visited,
+                              found_file& source, DARRAY_LA_RULE_CONST_PTR& chain) {
   /// The producers of one extension, and which of them is being tried.
   struct level {
     const std::vector<int>* producers;
@@ -286,7 +317,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
     int rule() const { return (*producers)[tried]; }
   };
   const auto producers_of = [this](int extension) { return &index->producers(extension); };
-  std::vector<level> path = {{producers_of(index->extension(wanted.get_ext())), 0}};
+  std::vector<level> path = {{producers_of(index->extension(wanted)), 0}};
   std::vector<bool> failed(index->num_spellings());
 
   while (path.back().tried < path.back().producers->size() || path.size() > 1) {
@@ -295,7 +326,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
       path.pop_back();
       const int needing = path.back().rule();
       visited[needing] = 0;
-      if (find_input(given, *rules->rules.elements[needing], source)) {
+      if (find_input(where, *rules->rules.elements[needing], source)) {
         for (auto used = path.rbegin(); used != path.rend(); ++used) {
           visited[used->rule()] = 0;
           chain.append(rules->rules.elements[used->rule()]);
@@ -323,7 +354,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
       return LA_FAILED;
     }
     const char* only_name = rule.netlist_file->get_name();
-    const bool for_another = only_name != nullptr && !given.match_name(only_name);
+    const bool for_another = only_name != nullptr && !where.given.match_name(only_name);
     if (for_another || failed[index->spelling(i)]) {
       note(i, for_another   ? LA_EXPLANATION::FOR_ANOTHER_NAME
               : named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED
@@ -343,16 +374,12 @@ void LA_LAUNCHER::note(int rule, LA_EXPLANATION::VERDICT verdict) const {
 }
 
 /// Looks for the file that a rule reads. Where the user named a file, it is that or none.
-bool LA_LAUNCHER::find_input(const LA_FULLFILE& given, const LA_RULE& rule, LA_FULLFILE& source) {
+bool LA_LAUNCHER::find_input(lookup& where, const LA_RULE& rule, found_file& source) {
   const char* ext = rule.netlist_file->get_ext();
-  if (named_found) {
-    if (!named_file.match_ext(ext)) return false;
-    source = named_file;
-    return true;
-  }
-  LA_FULLFILE candidate(given);
-  candidate.set_ext(ext);
-  return find_file(candidate, source);
+  if (!named_found) return find_file(where, ext, source);
+  if (!named_file.file.match_ext(ext)) return false;
+  source = named_file;
+  return true;
 }
 
 void LA_LAUNCHER::report_loop(const unsigned char* visited) {
@@ -386,11 +413,6 @@ constexpr decision_report REPORTS[] = {
     {LA_BUILD_NO_TIMESTAMP, true,
      "Launcher: %s being compiled because the time stamps could not be determined\n"},
 };
-
-Port::FileStatus status_of(const LA_FULLFILE& file) {
-  const char* path = file.get_fullfile();
-  return path != nullptr ? Port::File::status(path) : Port::FileStatus();
-}
 
 }  // namespace
 
@@ -432,13 +454,25 @@ class LA_LAUNCHER::working_directory {
   bool left_ = false;
 };
 
-short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
-                               unsigned char top, char* netlist_path) {
-  la_command_options options;
-  set_options(options);
+/// What the runs of a chain have in common.
+struct LA_LAUNCHER::shared_by_runs {
+  explicit shared_by_runs(const LA_LAUNCHER& launcher) { launcher.set_options(options); }
+
   working_directory directory;
-  build_step step = {source, nullptr, source, LA_FULLFILE(*output_dir, source.get_tail()),
-                     force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED};
+  la_command_options options;
+};
+
+short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
+                               unsigned char top, char* netlist_path) {
+  std::optional<shared_by_runs> shared;
+  // A device table that is damaged, which makes the rules invalid, is reported before the steps.
+  if (!ok) shared.emplace(*this);
+  build_step step = {source.file,
+                     nullptr,
+                     source.file,
+                     LA_FULLFILE(*output_dir, source.file.get_tail()),
+                     force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED,
+                     source.status};
   for (const LA_RULE* rule : chain) {
     step.rule = rule;
     if (detail) message().issueStatus("Launcher: Using rule %s\n", rule->rule_name.get());
@@ -447,7 +481,7 @@ short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_C
       message().issueError(
           "Launcher: The output of rule %s for %s has no name of at most %d characters in the "
           "output directory.\n",
-          rule->rule_name.get(), source.get_tail(), LA_MAX_PATH - 1);
+          rule->rule_name.get(), source.file.get_tail(), LA_MAX_PATH - 1);
       ++errors;
       return LA_FAILED;
     }
@@ -455,13 +489,15 @@ short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_C
     note(step);
     if (!report_decision(step)) return LA_FAILED;
     if (step.decision > LA_BUILD_UNDECIDED) {
-      if (!run_netlister(step, directory, options, top)) return LA_FAILED;
+      if (!shared) shared.emplace(*this);
+      if (!run_netlister(step, *shared, top)) return LA_FAILED;
       step.decision = LA_BUILD_AFTER_REBUILD;
     }
     step.input = step.output;
     step.input_status = step.output_status;
   }
   UT_STR::Copy(netlist_path, step.output.get_fullfile());
+  netlist_seen = step.decision < LA_BUILD_UNDECIDED;
   return LA_FOUND;
 }
 
@@ -571,8 +607,8 @@ std::string argument_of(const LA_FULLFILE& file) {
 }  // namespace
 
 /// Runs the step's netlister and judges how it ended. False when the chain ends here.
-bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& directory,
-                                la_command_options& options, unsigned char top) {
+bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, unsigned char top) {
+  auto& [directory, options] = shared;
   if (directory.home().get_dir() == nullptr) {
     message().issueError(
         "Launcher: The current directory is gone, too long, or has a backslash in its name: %s is "
