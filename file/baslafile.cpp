@@ -110,11 +110,10 @@ struct path_parts {
   bool is_absolute() const { return dir != nullptr && dir[0] == '/'; }
 };
 
-/// Splits a directory name into host, drive and directory. False for null, an empty name, a UNC
-/// name without host, and one that does not fit.
-bool la_split_dir(const char* path, path_parts& parts) {
-  if (path == nullptr || *path == '\0') return false;
-  la_path_text text(path);
+/// Splits a directory name into host, drive and directory. False for an empty name, a UNC name
+/// without host, and one that does not fit.
+bool la_split_dir(la_path_text& text, path_parts& parts) {
+  if (text.length() == 0) return false;
   const char* rest = text.chars();
   if (rest[0] == '/' && rest[1] == '/') {
     const char* host = rest + 2;
@@ -133,32 +132,27 @@ bool la_split_dir(const char* path, path_parts& parts) {
   return text.fits();
 }
 
-/// Splits a file name without directory at its last dot. False for null, an empty name and one
-/// that does not fit.
-bool la_split_tail(const char* tail, path_parts& parts) {
-  if (tail == nullptr || *tail == '\0') return false;
-  la_path_text text(tail);
-  if (!text.fits()) return false;
-  if (char* dot = UT_STR::RFindChar(text.chars(), '.')) {
+/// Splits a file name without directory at its last dot.
+void la_split_tail(char* tail, path_parts& parts) {
+  if (char* dot = UT_STR::RFindChar(tail, '.')) {
     *dot = '\0';
     if (dot[1] != '\0') parts.ext = dot + 1;
   }
-  if (*text.chars() != '\0') parts.name = text.chars();
-  return true;
+  if (*tail != '\0') parts.name = tail;
 }
 
-/// Splits a path into its parts. False where one of the two splitters above fails on its piece,
-/// for null, an empty path, and one that does not fit.
+/// Splits a path into its parts. False for null, an empty path, one that does not fit, and one
+/// whose directory cannot be split.
 bool la_split_path(const char* path, path_parts& parts) {
   if (path == nullptr || *path == '\0') return false;
   la_path_text text(path);
   if (!text.fits()) return false;
-  const char* slash = UT_STR::RFindChar(text.chars(), '/');
-  const char* tail = slash != nullptr ? slash + 1 : text.chars();
-  if (*tail != '\0' && !la_split_tail(tail, parts)) return false;
+  char* const slash = UT_STR::RFindChar(text.chars(), '/');
+  char* const tail = slash != nullptr ? slash + 1 : text.chars();
+  la_split_tail(tail, parts);
   if (slash == nullptr) return true;
   text.cut(static_cast<std::size_t>(tail - text.chars()));
-  return la_split_dir(text.chars(), parts);
+  return la_split_dir(text, parts);
 }
 
 /// Resolves "./" and "../", wherever they stand. False when "../" would climb above the first
@@ -203,10 +197,11 @@ unsigned char LA_DIR::set_dir(const char* path) {
   path_parts parts;
   la_path_text joined;
   if (path != nullptr) {
-    if (!la_split_dir(path, parts)) return set_dir();
+    la_path_text text(path);
+    if (!la_split_dir(text, parts)) return set_dir();
   } else {
     joined = current_directory();
-    if (!joined.fits() || !la_split_dir(joined.chars(), parts)) return set_dir();
+    if (!joined.fits() || !la_split_dir(joined, parts)) return set_dir();
   }
   if (!parts.is_absolute()) {
     joined = current_directory();
@@ -292,7 +287,14 @@ unsigned char LA_FILE::set_ext(const char* new_ext) {
 
 unsigned char LA_FILE::set_tail(const char* tail) {
   path_parts parts;
-  if (!la_split_tail(tail, parts) && tail != nullptr && *tail != '\0') head = la_text();
+  if (tail != nullptr) {
+    la_path_text text(tail);
+    if (text.fits()) {
+      la_split_tail(text.chars(), parts);
+    } else {
+      head = la_text();
+    }
+  }
   name = std::move(parts.name);
   ext = std::move(parts.ext);
   return names_file();

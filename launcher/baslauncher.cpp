@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <cstring>
 #include <exception>
 #include <iterator>
 #include <optional>
@@ -41,6 +42,11 @@ Port::FileStatus status_of(const char* path) {
 
 Port::FileStatus status_of(const LA_FULLFILE& file) {
   return status_of(file.get_fullfile());
+}
+
+/// A full name without its directory.
+const char* tail_of(const char* path) {
+  return std::strrchr(path, '/') + 1;
 }
 
 /// The elements of an array that is kept with its count.
@@ -140,18 +146,14 @@ short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) {
 
 /// The name that find was given, and where it looks for files of this name.
 struct LA_LAUNCHER::lookup {
-  explicit lookup(const LA_FULLFILE& given) : given(given), beside(given) {}
+  explicit lookup(const LA_FULLFILE& given) : given(given), root(given.get_root()), beside(given) {}
 
-  /// The file of the given name with another extension.
-  LA_FULLFILE with_ext(const char* ext) const {
-    LA_FULLFILE file(given);
-    file.set_ext(ext);
-    return file;
-  }
+  /// The given name with another extension.
+  std::string file(const char* ext) const { return ext != nullptr ? root + "." + ext : root; }
 
   const LA_FULLFILE& given;
-  LA_FULLROOT beside;                       ///< where the name says
-  std::vector<LA_FULLROOT> in_searchpaths;  ///< empty before they are needed
+  const std::string root;  ///< head and name
+  LA_FULLROOT beside;      ///< where the name says
 };
 
 short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
@@ -169,6 +171,7 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
   }
 
   lookup where(given);
+  in_searchpaths.clear();
   found_file source;
   DARRAY_LA_RULE_CONST_PTR chain(3);
   find_named(where);
@@ -227,7 +230,7 @@ short LA_LAUNCHER::find_native(lookup& where, bool named_kbc, found_file& source
   if (!found_first && !find_file(where, "kbc", source)) return LA_NOT_FOUND;
   if (found_first && !named_kbc) {
     message().issueStatus("Launcher: NOT compiling %s because its source was not found\n",
-                          where.with_ext(ext).get_tail());
+                          source.file.get_tail());
   }
   UT_STR::Copy(netlist_path, source.file.get_fullfile());
   netlist_seen = true;
@@ -242,7 +245,8 @@ bool LA_LAUNCHER::find_file(lookup& where, const char* ext, found_file& found) {
   const Port::FileStatus status = status_of(path);
   note(path, status.exists ? LA_EXPLANATION::FOUND : LA_EXPLANATION::MISSING);
   if (!status.exists) return find_in_searchpaths(where, ext, found);
-  found = {where.with_ext(ext), status};
+  found = {where.given, status};
+  found.file.set_ext(ext);
   return true;
 }
 
@@ -255,18 +259,18 @@ void LA_LAUNCHER::note(const char* path, LA_EXPLANATION::SIGHTING sighting) cons
 /// over is complete. found is written only when there is one.
 unsigned char LA_LAUNCHER::find_in_searchpaths(lookup& where, const char* ext, found_file& found) {
   const auto dirs = counted(searchpaths, num_searchpaths);
-  if (where.in_searchpaths.size() < dirs.size()) {
-    // As a head may begin with a drive, which is dropped.
-    const LA_FILE relative(where.with_ext(ext).get_file());
-    where.in_searchpaths.reserve(dirs.size());
-    for (const auto& dir : dirs) where.in_searchpaths.emplace_back(*dir, relative.get_root());
+  if (in_searchpaths.size() < dirs.size()) {
+    // A head may begin with a drive, which is dropped.
+    const LA_FILE relative((where.root + ".").c_str());
+    const char* root = relative.get_root();
+    in_searchpaths.reserve(dirs.size());
+    for (const auto& dir : dirs) in_searchpaths.emplace_back(*dir, root);
   }
-  la_text file;
   bool found_any = false;
   Port::StringBase<char> first;
   Port::StringBase<char> others;
   for (std::size_t i = 0; i < dirs.size(); ++i) {
-    const char* path = where.in_searchpaths[i].with_ext(ext);
+    const char* path = in_searchpaths[i].with_ext(ext);
     const Port::FileStatus status = status_of(path);
     if (!status.exists) {
       note(path, LA_EXPLANATION::MISSING);
@@ -275,8 +279,7 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(lookup& where, const char* ext, f
     const Port::StringBase<char> name(path);
     if (!found_any) {
       note(path, LA_EXPLANATION::FOUND);
-      file = where.with_ext(ext).get_file();
-      found = {LA_FULLFILE(*dirs[i], file), status};
+      found = {LA_FULLFILE(*dirs[i], where.file(ext).c_str()), status};
       first = name;
       found_any = true;
     } else if (!(name == first) && others.GetIndexOfString(name, Port::StringBase<char>::EXACT) ==
@@ -292,7 +295,7 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(lookup& where, const char* ext, f
         "Found resolution for '%s' using the search path (-sd switches):\n\t%s\nOther matching "
         "files found later in the search path will not be used:\n%sEnsure that the correct file "
         "is used by modifying the search path order.\n",
-        file.get(), first.c_str(), others.c_str());
+        where.file(ext).c_str(), first.c_str(), others.c_str());
   }
   return found_any;
 }
@@ -317,7 +320,9 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
     int rule() const { return (*producers)[tried]; }
   };
   const auto producers_of = [this](int extension) { return &index->producers(extension); };
-  std::vector<level> path = {{producers_of(index->extension(wanted)), 0}};
+  std::vector<level> path;
+  path.reserve(8);  // Few chains are longer.
+  path.push_back({producers_of(index->extension(wanted)), 0});
   std::vector<bool> failed(index->num_spellings());
 
   while (path.back().tried < path.back().producers->size() || path.size() > 1) {
@@ -420,12 +425,11 @@ constexpr decision_report REPORTS[] = {
 struct LA_LAUNCHER::build_step {
   const LA_FULLFILE& source;
   const LA_RULE* rule;
-  LA_FULLFILE input;
-  LA_FULLFILE output;
+  const LA_RULE* rule_before;  ///< whose output is the input; null in the first step
+  const char* output;
   LA_BUILD_DECISION decision;
-  /// What is known of the files. The output of a step that did not run is, as the input of the
-  /// next one, not asked for again.
-  std::optional<Port::FileStatus> input_status = std::nullopt;
+  /// What is known of the files. None is asked for twice, if no netlister runs.
+  Port::FileStatus input_status;
   Port::FileStatus output_status = {};
   /// The dependency file that is newer than the output.
   std::string dependency = {};
@@ -467,17 +471,16 @@ short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CO
   std::optional<shared_by_runs> shared;
   // A device table that is damaged, which makes the rules invalid, is reported before the steps.
   if (!ok) shared.emplace(*this);
-  build_step step = {source.file,
-                     nullptr,
-                     source.file,
-                     LA_FULLFILE(*output_dir, source.file.get_tail()),
-                     force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED,
-                     source.status};
+  const LA_FILE tail(source.file.get_tail());
+  LA_FULLROOT outputs(*output_dir, tail.get_root());
+  build_step step = {
+      source.file,  nullptr, nullptr, nullptr, force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED,
+      source.status};
   for (const LA_RULE* rule : chain) {
-    step.rule = rule;
+    step.rule_before = std::exchange(step.rule, rule);
     if (detail) message().issueStatus("Launcher: Using rule %s\n", rule->rule_name.get());
-    step.output.set_ext(rule->target->get_ext());
-    if (step.output.get_fullfile() == nullptr) {
+    step.output = outputs.with_ext(rule->target->get_ext());
+    if (step.output == nullptr) {
       message().issueError(
           "Launcher: The output of rule %s for %s has no name of at most %d characters in the "
           "output directory.\n",
@@ -493,12 +496,22 @@ short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CO
       if (!run_netlister(step, *shared, top)) return LA_FAILED;
       step.decision = LA_BUILD_AFTER_REBUILD;
     }
-    step.input = step.output;
     step.input_status = step.output_status;
   }
-  UT_STR::Copy(netlist_path, step.output.get_fullfile());
+  UT_STR::Copy(netlist_path, step.output);
   netlist_seen = step.decision < LA_BUILD_UNDECIDED;
   return LA_FOUND;
+}
+
+/// The file that a rule of a chain makes.
+LA_FULLFILE LA_LAUNCHER::output_of(const LA_FULLFILE& source, const LA_RULE& rule) const {
+  LA_FULLFILE output(*output_dir, source.get_tail());
+  output.set_ext(rule.target->get_ext());
+  return output;
+}
+
+LA_FULLFILE LA_LAUNCHER::input_of(const build_step& step) const {
+  return step.rule_before != nullptr ? output_of(step.source, *step.rule_before) : step.source;
 }
 
 /// Sets every keyword but those of a step's files.
@@ -557,10 +570,9 @@ void LA_LAUNCHER::decide(build_step& step) const {
     step.decision = LA_BUILD_SKIPPED;
     return;
   }
-  if (!step.input_status) step.input_status = status_of(step.input);
-  if (!step.input_status->exists) {
+  if (!step.input_status.exists) {
     step.decision = LA_BUILD_NO_TIMESTAMP;
-  } else if (step.input_status->time > step.output_status.time) {
+  } else if (step.input_status.time > step.output_status.time) {
     step.decision = LA_BUILD_OUT_OF_DATE;
   } else {
     step.decision = decide_by_dependency_files(step);
@@ -570,9 +582,9 @@ void LA_LAUNCHER::decide(build_step& step) const {
 /// Adds the step to the explanation.
 void LA_LAUNCHER::note(const build_step& step) const {
   if (explanation == nullptr) return;
-  explanation->steps.push_back({step.rule, step.input.get_fullfile(), step.output.get_fullfile(),
-                                step.input_status.value_or(Port::FileStatus()), step.output_status,
-                                step.dependency, step.dependency_status, step.decision, ""});
+  explanation->steps.push_back({step.rule, input_of(step).get_fullfile(), step.output,
+                                step.input_status, step.output_status, step.dependency,
+                                step.dependency_status, step.decision, ""});
 }
 
 /// Reports the decision. False when it ends the chain.
@@ -580,14 +592,14 @@ bool LA_LAUNCHER::report_decision(const build_step& step) {
   if (step.decision == LA_BUILD_UNSUPPORTED) {
     message().issueError(
         "Launcher: Netlist format of %s is no longer supported, could not create %s\n",
-        step.input.get_fullfile(), step.output.get_tail());
+        input_of(step).get_fullfile(), tail_of(step.output));
     ++errors;
     return false;
   }
   for (const decision_report& report : REPORTS) {
     if (report.decision != step.decision || (report.only_detail && !detail)) continue;
-    const bool gone = step.decision == LA_BUILD_AFTER_REBUILD && !step.output.exists();
-    message().issueStatus(gone ? MISSING : report.text, step.output.get_tail());
+    const bool gone = step.decision == LA_BUILD_AFTER_REBUILD && !status_of(step.output).exists;
+    message().issueStatus(gone ? MISSING : report.text, tail_of(step.output));
   }
   return true;
 }
@@ -617,9 +629,11 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
     ++errors;
     return false;
   }
-  enter_directory(step, directory);
+  const LA_FULLFILE input = input_of(step);
+  const LA_FULLFILE output = output_of(step.source, *step.rule);
+  enter_directory(*step.rule, input, output, directory);
   std::string command;
-  if (!make_command(step, options, top, command)) return false;
+  if (!make_command(*step.rule, input, output, options, top, command)) return false;
   message().issueStatus("Launcher: Executing %s\n", command.c_str());
   if (explanation != nullptr) explanation->steps.back().command = command;
   if (Port_Env::GetEnv("LA_TEST") != nullptr) return true;
@@ -631,26 +645,26 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
 
 /// Sees to it that what a failed run has written is not taken for up to date later: it gets the
 /// oldest time stamp that there is. Its content stays for whoever wants to look into it.
-void LA_LAUNCHER::distrust(const LA_FULLFILE& output, const Port::FileStatus& before) {
+void LA_LAUNCHER::distrust(const char* output, const Port::FileStatus& before) {
   const Port::FileStatus after = status_of(output);
   if (!after.exists || (before.exists && after.time == before.time)) return;
-  if (!Port::File::setoldest(output.get_fullfile())) {
+  if (!Port::File::setoldest(output)) {
     message().issueWarning(
         "Launcher: %s comes from a failed run, and its time stamp could not be set back: remove "
         "it\n",
-        output.get_tail());
+        tail_of(output));
     ++warnings;
   } else if (detail) {
     message().issueStatus(
         "Launcher: %s comes from a failed run, its time stamp is set back: it will be made again\n",
-        output.get_tail());
+        tail_of(output));
   }
 }
 
 /// Goes to the directory that the rule asks for. Where it cannot be entered, the netlister runs
 /// where the process stands.
-void LA_LAUNCHER::enter_directory(const build_step& step, working_directory& directory) const {
-  const LA_RULE& rule = *step.rule;
+void LA_LAUNCHER::enter_directory(const LA_RULE& rule, const LA_FULLFILE& input,
+                                  const LA_FULLFILE& output, working_directory& directory) const {
   const char* name = nullptr;
   switch (rule.netlister_dir_flag) {
     case DIR_UNSET:
@@ -658,10 +672,10 @@ void LA_LAUNCHER::enter_directory(const build_step& step, working_directory& dir
       name = directory.home().get_dir();
       break;
     case DIR_SOURCE:
-      name = step.input.get_fullhead();
+      name = input.get_fullhead();
       break;
     case DIR_OUTPUT:
-      name = step.output.get_fullhead();
+      name = output.get_fullhead();
       break;
     default:
       name = rule.netlister_dir ? rule.netlister_dir->get_dir() : nullptr;
@@ -680,18 +694,18 @@ void LA_LAUNCHER::enter_directory(const build_step& step, working_directory& dir
 }
 
 /// Makes the command line of the step.
-bool LA_LAUNCHER::make_command(const build_step& step, la_command_options& options,
+bool LA_LAUNCHER::make_command(const LA_RULE& rule, const LA_FULLFILE& input,
+                               const LA_FULLFILE& output, la_command_options& options,
                                unsigned char top, std::string& command) {
-  const LA_RULE& rule = *step.rule;
   const char* options_template = top && rule.netlister_top_options != nullptr
                                      ? rule.netlister_top_options
                                      : rule.netlister_options;
   if (options_template == nullptr) options_template = "";
-  const std::string infile = argument_of(step.input);
-  const std::string outfile = argument_of(step.output);
+  const std::string infile = argument_of(input);
+  const std::string outfile = argument_of(output);
   if (infile.empty() || outfile.empty()) {
     message().issueError("Launcher: The name of %s is too long for a command line.\n",
-                         infile.empty() ? step.input.get_tail() : step.output.get_tail());
+                         infile.empty() ? input.get_tail() : output.get_tail());
     ++errors;
     return false;
   }

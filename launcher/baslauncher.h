@@ -4,6 +4,7 @@
 
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "file/baslafile.h"
 #include "host/port_process.h"
@@ -122,17 +123,20 @@ class LA_LAUNCHER {
   struct shared_by_runs;
   short build_chain(const found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
                     unsigned char top, char* netlist_path);
+  LA_FULLFILE output_of(const LA_FULLFILE& source, const LA_RULE& rule) const;
+  LA_FULLFILE input_of(const build_step& step) const;
   void set_options(la_command_options& options) const;
   void decide(build_step& step) const;
   static LA_BUILD_DECISION decide_by_dependency_files(build_step& step);
   void note(const build_step& step) const;
   bool report_decision(const build_step& step);
   bool run_netlister(const build_step& step, shared_by_runs& shared, unsigned char top);
-  void enter_directory(const build_step& step, working_directory& directory) const;
-  bool make_command(const build_step& step, la_command_options& options, unsigned char top,
-                    std::string& command);
+  void enter_directory(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
+                       working_directory& directory) const;
+  bool make_command(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
+                    la_command_options& options, unsigned char top, std::string& command);
   bool execute(const LA_RULE& rule, const std::string& command);
-  void distrust(const LA_FULLFILE& output, const Port::FileStatus& before);
+  void distrust(const char* output, const Port::FileStatus& before);
 
   la_text part_name;
   std::unique_ptr<LA_DIR> output_dir;
@@ -148,6 +152,9 @@ class LA_LAUNCHER {
   la_text aul;
   unsigned char named_found = 0;
   found_file named_file;
+  /// Where this find looks for its name in the search directories; none before that is needed. Kept
+  /// for the sake of its memory.
+  std::vector<LA_FULLROOT> in_searchpaths;
   bool netlist_seen = false;
   std::unique_ptr<LA_RULE_SET> rules;
   std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions
