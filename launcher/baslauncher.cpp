@@ -158,7 +158,10 @@ struct LA_LAUNCHER::lookup {
 
 short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
                                 unsigned char top) {
-  LA_FULLFILE given(name);
+  home.set_dir(nullptr);
+  const char* current = home.get_dir();
+  home_name = current != nullptr ? current : "";
+  LA_FULLFILE given(home, name);
   bool named_kbc = false;
   if (given.match_ext("kbo")) {
     given.set_ext(nullptr);
@@ -194,7 +197,7 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
     return false;
   }
   if (fits && given.get_fullfile() != nullptr) return true;
-  if (fits && LA_DIR(nullptr).get_dir() == nullptr) {
+  if (fits && home.get_dir() == nullptr) {
     message().issueError(
         "Launcher: The current directory cannot be used for netlist \"%s\": it is gone, too long, "
         "or has a backslash in its name.\n",
@@ -239,10 +242,18 @@ short LA_LAUNCHER::find_native(lookup& where, bool named_kbc, found_file& source
 
 // ---- Search-path resolution ----
 
+/// What the file system knows of a file while the current directory is home. Below it, a name is
+/// looked up from there: that spares the file system the way down to it.
+Port::FileStatus LA_LAUNCHER::status_at_home(const char* path) const {
+  const bool is_below = path != nullptr && std::string_view(path).starts_with(home_name) &&
+                        path[home_name.size()] != '/';
+  return status_of(is_below ? path + home_name.size() : path);
+}
+
 /// Looks where the name says, then in the search directories.
 bool LA_LAUNCHER::find_file(lookup& where, const char* ext, found_file& found) {
   const char* path = where.beside.with_ext(ext);
-  const Port::FileStatus status = status_of(path);
+  const Port::FileStatus status = status_at_home(path);
   note(path, status.exists ? LA_EXPLANATION::FOUND : LA_EXPLANATION::MISSING);
   if (!status.exists) return find_in_searchpaths(where, ext, found);
   found = {where.given, status};
@@ -271,7 +282,7 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(lookup& where, const char* ext, f
   Port::StringBase<char> others;
   for (std::size_t i = 0; i < dirs.size(); ++i) {
     const char* path = in_searchpaths[i].with_ext(ext);
-    const Port::FileStatus status = status_of(path);
+    const Port::FileStatus status = status_at_home(path);
     if (!status.exists) {
       note(path, LA_EXPLANATION::MISSING);
       continue;
@@ -439,28 +450,29 @@ struct LA_LAUNCHER::build_step {
 /// The current directory of the process during a chain: back home at its end, whatever happens.
 class LA_LAUNCHER::working_directory {
  public:
-  working_directory() : home_(nullptr) {}
+  /// home: the directory that is current.
+  explicit working_directory(const LA_DIR& home) : home_(home) {}
   working_directory(const working_directory&) = delete;
   working_directory& operator=(const working_directory&) = delete;
   ~working_directory() {
     if (left_) home_.chdir();
   }
 
-  /// The directory that was current when the chain started.
-  const LA_DIR& home() const { return home_; }
   void enter(const LA_DIR& directory) {
     left_ = true;
     directory.chdir();
   }
 
  private:
-  const LA_DIR home_;
+  const LA_DIR& home_;
   bool left_ = false;
 };
 
 /// What the runs of a chain have in common.
 struct LA_LAUNCHER::shared_by_runs {
-  explicit shared_by_runs(const LA_LAUNCHER& launcher) { launcher.set_options(options); }
+  explicit shared_by_runs(const LA_LAUNCHER& launcher) : directory(launcher.home) {
+    launcher.set_options(options);
+  }
 
   working_directory directory;
   la_command_options options;
@@ -561,7 +573,7 @@ void LA_LAUNCHER::decide(build_step& step) const {
     return;
   }
   if (step.decision == LA_BUILD_FORCED || step.decision == LA_BUILD_AFTER_REBUILD) return;
-  step.output_status = status_of(step.output);
+  step.output_status = status_at_home(step.output);  // No netlister has run yet.
   if (!step.output_status.exists) {
     step.decision = LA_BUILD_MISSING;
     return;
@@ -621,7 +633,7 @@ std::string argument_of(const LA_FULLFILE& file) {
 /// Runs the step's netlister and judges how it ended. False when the chain ends here.
 bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, unsigned char top) {
   auto& [directory, options] = shared;
-  if (directory.home().get_dir() == nullptr) {
+  if (home.get_dir() == nullptr) {
     message().issueError(
         "Launcher: The current directory is gone, too long, or has a backslash in its name: %s is "
         "not run.\n",
@@ -669,7 +681,7 @@ void LA_LAUNCHER::enter_directory(const LA_RULE& rule, const LA_FULLFILE& input,
   switch (rule.netlister_dir_flag) {
     case DIR_UNSET:
     case DIR_NONE:
-      name = directory.home().get_dir();
+      name = home.get_dir();
       break;
     case DIR_SOURCE:
       name = input.get_fullhead();

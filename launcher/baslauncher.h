@@ -108,6 +108,7 @@ class LA_LAUNCHER {
   struct lookup;
   void find_named(lookup& where);
   short find_native(lookup& where, bool named_kbc, found_file& source, char* netlist_path);
+  Port::FileStatus status_at_home(const char* path) const;
   bool find_file(lookup& where, const char* ext, found_file& found);
   void note(const char* path, LA_EXPLANATION::SIGHTING sighting) const;
   unsigned char find_in_searchpaths(lookup& where, const char* ext, found_file& found);
@@ -156,6 +157,8 @@ class LA_LAUNCHER {
   /// for the sake of its memory.
   std::vector<LA_FULLROOT> in_searchpaths;
   bool netlist_seen = false;
+  LA_DIR home;            ///< the current directory when this find began
+  std::string home_name;  ///< its name, with "/" at its end; empty when it has none
   std::unique_ptr<LA_RULE_SET> rules;
   std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions
   LA_EXPLANATION* explanation = nullptr;
