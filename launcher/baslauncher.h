@@ -152,11 +152,11 @@ class LA_LAUNCHER {
   la_text quiet;
   la_text aul;
   unsigned char named_found = 0;
+  bool netlist_seen = false;
   found_file named_file;
   /// Where this find looks for its name in the search directories; none before that is needed. Kept
   /// for the sake of its memory.
   std::vector<LA_FULLROOT> in_searchpaths;
-  bool netlist_seen = false;
   LA_DIR home;            ///< the current directory when this find began
   std::string home_name;  ///< its name, with "/" at its end; empty when it has none
   std::unique_ptr<LA_RULE_SET> rules;

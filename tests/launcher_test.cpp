@@ -16,6 +16,7 @@
 // The questions to the system, counted: the linker puts these in the way.
 static int status_calls = 0;
 static int directory_calls = 0;
+// NOLINTBEGIN(bugprone-reserved-identifier)
 extern "C" {
 int __real_stat(const char* path, struct stat* status);
 int __wrap_stat(const char* path, struct stat* status) {
@@ -28,6 +29,7 @@ char* __wrap_getcwd(char* buffer, std::size_t size) {
   return __real_getcwd(buffer, size);
 }
 }
+// NOLINTEND(bugprone-reserved-identifier)
 
 namespace {
 
