@@ -145,13 +145,13 @@ TEST_F(Guest, ACommandShowsMessagesInOrderAndAtOnce) {
             "a\n~/d.kbo\n" +
                 again + "Launcher: d.kbo is up to date\n~/d.kbo\n");
   tree.remove("d.kbo");
-  run({"/bin/sh", "-c", "exec " + command + " -l say=now d >log 2>&1"}, "", [this](pid_t launch) {
-    for (int i = 0; i < 20'000 && !tree.read("log").ends_with("now\n"); ++i) ::usleep(1000);
-    ::kill(launch, SIGKILL);
+  std::string seen;
+  run({"/bin/sh", "-c", "exec " + command + " -l say=now d >log 2>&1"}, "", [&](pid_t launch) {
+    for (int i = 0; i < 20'000 && !seen.ends_with("now\n"); ++i, ::usleep(1000))
+      seen = tree.read("log");
+    ::kill(launch, SIGTERM);
   });
-  EXPECT_EQ(tree.read("log"), again +
-                                  "Launcher: Executing nl say=now out=\"d.kbo\" sleep=60000\n"
-                                  "now\n");
+  EXPECT_EQ(seen, again + "Launcher: Executing nl say=now out=\"d.kbo\" sleep=60000\nnow\n");
 }
 
 // The signals come when the last netlister of a chain has begun to write its output.
