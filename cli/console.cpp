@@ -35,22 +35,32 @@ constexpr appearance appearance_of(Port_MsgLevel level) {
 console::console(bool debug)
     : is_terminal_(::isatty(STDERR_FILENO) != 0),
       colour_(is_terminal_ && std::getenv("NO_COLOR") == nullptr),
-      before_(Port_MsgManData::setSink({show, this, debug})) {}
+      before_(Port_MsgManData::setSink({show, this, debug})) {
+  static char buffer[65536];
+  std::setvbuf(stderr, buffer, is_terminal_ ? _IOLBF : _IOFBF, sizeof buffer);
+  Port_MsgManData::setFlush([](void* /*context*/) { flush(); }, nullptr);
+}
 
 console::~console() {
+  Port_MsgManData::setFlush(nullptr, nullptr);
   Port_MsgManData::setSink(before_);
+  flush();
+}
+
+void console::flush() {
+  std::fflush(stderr);
 }
 
 void console::show(void* self, const Port_Msg& message) {
   const appearance look = appearance_of(message.level);
   const bool coloured = static_cast<console*>(self)->colour_ && *look.prefix != '\0';
-  std::string text;
-  if (coloured) text += look.colour;
-  text += look.prefix;
-  if (coloured) text += "\033[0m";
-  text += message.text;
-  if (!text.ends_with('\n')) text += '\n';
+  if (coloured) std::fputs(look.colour, stderr);
+  std::fputs(look.prefix, stderr);
+  if (coloured) std::fputs("\033[0m", stderr);
+  const std::string_view text = message.text;
   std::fwrite(text.data(), 1, text.size(), stderr);
+  if (!text.ends_with('\n')) std::fputc('\n', stderr);
+  if (message.level == PORT_MSG_WARNING || message.level == PORT_MSG_ERROR) flush();
 }
 
 diversion::diversion(std::function<bool(const Port_Msg&)> take)
@@ -67,6 +77,7 @@ void diversion::show(void* self, const Port_Msg& message) {
 
 void complain(const std::string& text) {
   std::fprintf(stderr, "kestrel-launch: %s\n", text.c_str());
+  console::flush();
 }
 
 std::string json_string(std::string_view text) {

@@ -9,6 +9,8 @@
 #include "host/port_msgman.h"
 
 /// Shows messages on standard error, in colour on a terminal that wants it, until it is destroyed.
+/// A terminal shows each line at once; elsewhere status texts wait for flush, for a netlister to
+/// start or to pause, or for a message that is more than a status.
 class console {
  public:
   explicit console(bool debug);
@@ -16,6 +18,8 @@ class console {
   console& operator=(const console&) = delete;
   ~console();
 
+  /// Writes what waits. To be called before something is written to standard output.
+  static void flush();
   /// Whether standard error is a terminal.
   bool is_terminal() const { return is_terminal_; }
 
@@ -42,7 +46,7 @@ class diversion {
   Port_MsgSink before_;
 };
 
-/// Says on standard error what the command itself has to say.
+/// Says on standard error, at once, what the command itself has to say.
 void complain(const std::string& text);
 
 /// text as a JSON string. A byte that is not UTF-8 becomes the lone surrogate U+DC00 + byte.

@@ -82,6 +82,7 @@ void print_totals(bool ok, int errors, int warnings) {
 
 void print_result(const settings& set, const std::string& name, short result, const char* source,
                   const char* netlist) {
+  console::flush();
   if (set.json) {
     std::printf("{\"name\":%s,\"result\":%d,\"source\":%s,\"netlist\":%s}\n",
                 json_string(name).c_str(), result, json_string(source).c_str(),
@@ -137,7 +138,8 @@ int resolve(settings& set, const console& shown) {
     char source[LA_MAX_PATH];
     char netlist[LA_MAX_PATH];
     short result = launcher.find(name.c_str(), source, netlist, set.top);
-    if (result == LA_FOUND && !is_dry_run() && !Port::File::exist(netlist)) {
+    if (result == LA_FOUND && !launcher.saw_netlist() && !is_dry_run() &&
+        !Port::File::exist(netlist)) {
       complain(std::string("no netlister has written ") + netlist);
       result = LA_FAILED;
       source[0] = '\0';

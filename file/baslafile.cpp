@@ -1,6 +1,7 @@
 #include "file/baslafile.h"
 
 #include <cstring>
+#include <string_view>
 #include <utility>
 
 #include "host/cvnform.h"
@@ -35,7 +36,7 @@ class la_path_text {
   /// text in the internal form.
   explicit la_path_text(const char* text) : la_path_text() {
     add(text);
-    Port::File::makeunixpath(chars_);
+    if (std::memchr(chars_, '\\', length_) != nullptr) Port::File::makeunixpath(chars_);
   }
 
   /// Appends text; null adds nothing.
@@ -109,11 +110,10 @@ struct path_parts {
   bool is_absolute() const { return dir != nullptr && dir[0] == '/'; }
 };
 
-/// Splits a directory name into host, drive and directory. False for null, an empty name, a UNC
-/// name without host, and one that does not fit.
-bool la_split_dir(const char* path, path_parts& parts) {
-  if (path == nullptr || *path == '\0') return false;
-  la_path_text text(path);
+/// Splits a directory name into host, drive and directory. False for an empty name, a UNC name
+/// without host, and one that does not fit.
+bool la_split_dir(la_path_text& text, path_parts& parts) {
+  if (text.length() == 0) return false;
   const char* rest = text.chars();
   if (rest[0] == '/' && rest[1] == '/') {
     const char* host = rest + 2;
@@ -132,37 +132,32 @@ bool la_split_dir(const char* path, path_parts& parts) {
   return text.fits();
 }
 
-/// Splits a file name without directory at its last dot. False for null, an empty name and one
-/// that does not fit.
-bool la_split_tail(const char* tail, path_parts& parts) {
-  if (tail == nullptr || *tail == '\0') return false;
-  la_path_text text(tail);
-  if (!text.fits()) return false;
-  if (char* dot = UT_STR::RFindChar(text.chars(), '.')) {
+/// Splits a file name without directory at its last dot.
+void la_split_tail(char* tail, path_parts& parts) {
+  if (char* dot = UT_STR::RFindChar(tail, '.')) {
     *dot = '\0';
     if (dot[1] != '\0') parts.ext = dot + 1;
   }
-  if (*text.chars() != '\0') parts.name = text.chars();
-  return true;
+  if (*tail != '\0') parts.name = tail;
 }
 
-/// Splits a path into its parts. False where one of the two splitters above fails on its piece,
-/// for null, an empty path, and one that does not fit.
+/// Splits a path into its parts. False for null, an empty path, one that does not fit, and one
+/// whose directory cannot be split.
 bool la_split_path(const char* path, path_parts& parts) {
   if (path == nullptr || *path == '\0') return false;
   la_path_text text(path);
   if (!text.fits()) return false;
-  const char* slash = UT_STR::RFindChar(text.chars(), '/');
-  const char* tail = slash != nullptr ? slash + 1 : text.chars();
-  if (*tail != '\0' && !la_split_tail(tail, parts)) return false;
+  char* const slash = UT_STR::RFindChar(text.chars(), '/');
+  char* const tail = slash != nullptr ? slash + 1 : text.chars();
+  la_split_tail(tail, parts);
   if (slash == nullptr) return true;
   text.cut(static_cast<std::size_t>(tail - text.chars()));
-  return la_split_dir(text.chars(), parts);
+  return la_split_dir(text, parts);
 }
 
 /// Resolves "./" and "../", wherever they stand. False when "../" would climb above the first
 /// directory.
-bool normalise(const la_path_text& from, la_path_text& to) {
+bool resolve_dots(const la_path_text& from, la_path_text& to) {
   for (const char* c = from.chars(); *c != '\0';) {
     if (std::strncmp(c, "../", 3) == 0) {
       for (int slashes = 0; slashes < 2; ++slashes) {
@@ -181,6 +176,14 @@ bool normalise(const la_path_text& from, la_path_text& to) {
   return true;
 }
 
+/// Brings a full name into its normal form, where there is one.
+void normalise(la_path_text& text) {
+  const std::string_view chars(text.chars(), text.length());
+  if (chars.find("./") == chars.npos && chars.find('\\') == chars.npos) return;
+  la_path_text normal;
+  if (text.fits() && resolve_dots(la_path_text(text.chars()), normal)) text = normal;
+}
+
 }  // namespace
 
 LA_DIR::LA_DIR(la_text unc_host, la_text drive, la_text dir)
@@ -194,10 +197,11 @@ unsigned char LA_DIR::set_dir(const char* path) {
   path_parts parts;
   la_path_text joined;
   if (path != nullptr) {
-    if (!la_split_dir(path, parts)) return set_dir();
+    la_path_text text(path);
+    if (!la_split_dir(text, parts)) return set_dir();
   } else {
     joined = current_directory();
-    if (!joined.fits() || !la_split_dir(joined.chars(), parts)) return set_dir();
+    if (!joined.fits() || !la_split_dir(joined, parts)) return set_dir();
   }
   if (!parts.is_absolute()) {
     joined = current_directory();
@@ -283,7 +287,14 @@ unsigned char LA_FILE::set_ext(const char* new_ext) {
 
 unsigned char LA_FILE::set_tail(const char* tail) {
   path_parts parts;
-  if (!la_split_tail(tail, parts) && tail != nullptr && *tail != '\0') head = la_text();
+  if (tail != nullptr) {
+    la_path_text text(tail);
+    if (text.fits()) {
+      la_split_tail(text.chars(), parts);
+    } else {
+      head = la_text();
+    }
+  }
   name = std::move(parts.name);
   ext = std::move(parts.ext);
   return names_file();
@@ -449,8 +460,7 @@ const char* LA_FULLFILE::get_fullroot() const {
 void LA_FULLFILE::append_full_name_to(la_path_text& text) const {
   dir->append_to(text);
   file->append_to(text);
-  la_path_text normal;
-  if (text.fits() && normalise(la_path_text(text.chars()), normal)) text = normal;
+  normalise(text);
 }
 
 const char* LA_FULLFILE::get_fullfile() const {
@@ -493,4 +503,29 @@ unsigned char LA_FULLFILE::get_timestamp(__int64& time) const {
 void LA_FULLFILE::dump() const {
   if (dir) dir->dump();
   if (file) file->dump();
+}
+
+LA_FULLROOT::LA_FULLROOT(const LA_DIR& directory, const char* root) {
+  if (directory.dir == nullptr || root == nullptr) return;
+  la_path_text text;
+  directory.append_to(text);
+  text.add(root);
+  if (!text.fits()) return;
+  room = LA_MAX_PATH - text.length();
+  normalise(text);
+  length = text.length();
+  std::memcpy(chars, text.chars(), length);
+}
+
+LA_FULLROOT::LA_FULLROOT(const LA_FULLFILE& file) : LA_FULLROOT(*file.dir, file.get_root()) {}
+
+const char* LA_FULLROOT::with_ext(const char* ext) {
+  const std::size_t added = ext != nullptr ? 1 + std::strlen(ext) : 0;
+  if (added >= room) return nullptr;
+  if (ext != nullptr) {
+    chars[length] = '.';
+    std::memcpy(chars + length + 1, ext, added - 1);
+  }
+  chars[length + added] = '\0';
+  return UT_PATH::ExternalPath(chars);
 }

@@ -48,6 +48,7 @@ class LA_DIR {
 
  private:
   friend class LA_FULLFILE;
+  friend class LA_FULLROOT;
   LA_DIR(la_text unc_host, la_text drive, la_text dir);
   void append_to(la_path_text& text) const;
 
@@ -181,6 +182,7 @@ class LA_FULLFILE {
   void dump() const;
 
  private:
+  friend class LA_FULLROOT;
   bool split(const char* filename);
   unsigned char settle();
   bool has_dir() const { return dir && dir->dir != nullptr; }
@@ -190,6 +192,26 @@ class LA_FULLFILE {
 
   std::unique_ptr<LA_DIR> dir;
   std::unique_ptr<LA_FILE> file;
+};
+
+/// The full names of files that differ in their extensions only, ready but for these: for when many
+/// of them are asked for.
+class LA_FULLROOT {
+ public:
+  /// Of the files with this head and name (LA_FILE::get_root) in the directory.
+  LA_FULLROOT(const LA_DIR& directory, const char* root);
+  /// Of the files that differ from this one, which has a name and is complete.
+  explicit LA_FULLROOT(const LA_FULLFILE& file);
+
+  /// LA_FULLFILE::get_fullfile of the file with this extension, which has no "/"; null for none.
+  /// Good until the next call.
+  const char* with_ext(const char* ext);
+
+ private:
+  char chars[LA_MAX_PATH];
+  std::size_t length = 0;
+  std::size_t room =
+      0;  ///< for dot, extension and terminator; less than in chars when that is normal
 };
 
 #endif

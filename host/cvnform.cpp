@@ -1,5 +1,7 @@
 #include "host/cvnform.h"
 
+#include <cstring>
+
 #include "host/ut_str.h"
 #include "host/utf8.h"
 
@@ -7,11 +9,12 @@
 // NOLINTBEGIN(clang-analyzer-valist.Uninitialized)
 std::string format_text(const char* format, va_list arguments) {
   std::string text;
+  text.reserve(120);  // Most texts are shorter.
   for (const char* f = format; *f != '\0'; ++f) {
-    if (*f != '%' || f[1] == '\0') {
-      text += *f;
-      continue;
-    }
+    const std::size_t plain = std::strcspn(f, "%");
+    text.append(f, plain);
+    f += plain;
+    if (*f == '\0') break;
     switch (*++f) {
       case 's':
         if (const char* value = va_arg(arguments, const char*)) text += value;
@@ -25,6 +28,8 @@ std::string format_text(const char* format, va_list arguments) {
       case 'c':
         text += static_cast<char>(va_arg(arguments, int));
         break;
+      case '\0':
+        return text + '%';
       default:
         text += *f;
     }

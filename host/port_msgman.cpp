@@ -22,12 +22,25 @@ Port_MsgSink& sink() {
   return current;
 }
 
+struct {
+  void (*function)(void* context);
+  void* context;
+} flush_of_sink = {nullptr, nullptr};
+
 }  // namespace
 
 Port_MsgSink Port_MsgManData::setSink(const Port_MsgSink& new_sink) {
   const Port_MsgSink old = sink();
   sink() = new_sink.function != nullptr ? new_sink : START_SINK;
   return old;
+}
+
+void Port_MsgManData::setFlush(void (*flush)(void* context), void* context) {
+  flush_of_sink = {flush, context};
+}
+
+void Port_MsgManData::flush() {
+  if (flush_of_sink.function != nullptr) flush_of_sink.function(flush_of_sink.context);
 }
 
 Port_MsgManData& Port_MsgManData::createObject(const char* program, const char* file, int line,
@@ -41,9 +54,16 @@ Port_MsgManData& Port_MsgManData::createObject(const char* program, const char* 
 }
 
 void Port_MsgManData::issue(Port_MsgLevel level, const char* format, va_list arguments) const {
-  const std::string text = format_text(format, arguments);
+  hand_on(level, format_text(format, arguments).c_str());
+}
+
+void Port_MsgManData::hand_on(Port_MsgLevel level, const char* text) const {
   const Port_MsgSink current = sink();
-  current.function(current.context, {level, program_, file_, line_, revision_, text.c_str()});
+  current.function(current.context, {level, program_, file_, line_, revision_, text});
+}
+
+void Port_MsgManData::issueStatusText(const char* text) {
+  hand_on(PORT_MSG_STATUS, text);
 }
 
 void Port_MsgManData::issueStatus(const char* format, ...) {

@@ -40,6 +40,13 @@ class Port_MsgManData {
   /// stands, the others behind "INFO: ", "WARNING: " or "ERROR: ".
   static Port_MsgSink setSink(const Port_MsgSink& sink);
 
+  /// Makes flush the function that is called, with context, when no message follows at once: before
+  /// a netlister starts, and when it has written nothing more for the moment. It is for a sink that
+  /// collects texts. Null for none, as at the start.
+  static void setFlush(void (*flush)(void* context), void* context);
+  /// Calls that function.
+  static void flush();
+
   /// The manager, prepared for one message that comes from the given place. The texts must stay
   /// until that message has been issued.
   static Port_MsgManData& createObject(const char* program, const char* file, int line,
@@ -50,11 +57,15 @@ class Port_MsgManData {
   void issueWarning(const char* format, ...);
   void issueError(const char* format, ...);
 
+  /// Issues a status message whose text is no format and is handed on as it stands, not copied.
+  void issueStatusText(const char* text);
+
   /// Issues a debug trace, without origin.
   static void debugStub(const char* format, ...);
 
  private:
   void issue(Port_MsgLevel level, const char* format, va_list arguments) const;
+  void hand_on(Port_MsgLevel level, const char* text) const;
 
   const char* program_ = nullptr;
   const char* file_ = nullptr;

@@ -108,33 +108,67 @@ class child_start {
   posix_spawnattr_t attributes_;
 };
 
+/// How many bytes at the end of the text are the start of a UTF-8 character that goes on.
+std::size_t cut_character(std::string_view text) {
+  for (std::size_t bytes = 1; bytes <= std::min<std::size_t>(text.size(), 3); ++bytes) {
+    const auto first = static_cast<unsigned char>(text[text.size() - bytes]);
+    if ((first & 0xC0) == 0x80) continue;
+    const std::size_t all = first < 0xC0 ? 1 : first < 0xE0 ? 2 : first < 0xF0 ? 3 : 4;
+    return all > bytes ? bytes : 0;
+  }
+  return 0;
+}
+
 /// Cuts what a child writes into lines.
 class line_cutter {
  public:
-  explicit line_cutter(Port_Process& process) : process_(process) {}
-
-  void add(std::string_view text) {
-    while (!text.empty()) {
-      const std::size_t length = std::min({text.find('\n'), text.size(), LONGEST - length_});
-      append(text.substr(0, length));
-      text.remove_prefix(length);
-      if (text.empty()) return;
-      if (text.front() == '\n') {
-        line_ += '\n';
-        text.remove_prefix(1);
-      }
-      flush();
-    }
-  }
-  void flush() {
-    if (!line_.empty()) process_.Output(line_.c_str());
-    line_.clear();
-    length_ = 0;
-  }
-
- private:
+  /// The longest line, and the most that is added at once: a line that lies in it as a whole is
+  /// not too long.
   static constexpr std::size_t LONGEST = 65536;
 
+  explicit line_cutter(Port_Process& process) : process_(process) {}
+
+  /// Adds a block, behind which there is room for one character more. Lines that lie in it as they
+  /// are to be shown are handed out from where they are.
+  void add(char* text, std::size_t length) {
+    char* const end = text + length;
+    const bool has_zero = std::memchr(text, '\0', length) != nullptr;
+    for (char* next = after_line(text, end); next != nullptr;) {
+      // Looked for first: to search right behind a byte that was just written is slow.
+      char* const after_next = after_line(next, end);
+      if (has_zero || !line_.empty()) {
+        collect({text, static_cast<std::size_t>(next - text)});
+      } else {
+        const char after = std::exchange(*next, '\0');
+        process_.Output(text);
+        *next = after;
+      }
+      text = std::exchange(next, after_next);
+    }
+    collect({text, static_cast<std::size_t>(end - text)});
+  }
+  /// Hands out what there is of a line.
+  void flush() { hand_out(line_.size()); }
+
+ private:
+  static char* after_line(char* text, const char* end) {
+    void* const found = std::memchr(text, '\n', static_cast<std::size_t>(end - text));
+    return found != nullptr ? static_cast<char*>(found) + 1 : nullptr;
+  }
+  /// Adds text that ends where the line does, if not before.
+  void collect(std::string_view text) {
+    while (!text.empty()) {
+      const bool ends = text.back() == '\n';
+      const std::size_t length = std::min(text.size() - (ends ? 1 : 0), LONGEST - length_);
+      append(text.substr(0, length));
+      text.remove_prefix(length);
+      if (text == "\n") {
+        line_ += '\n';
+        return flush();
+      }
+      if (!text.empty()) hand_out(line_.size() - cut_character(line_));
+    }
+  }
   void append(std::string_view text) {
     length_ += text.size();
     for (std::size_t zero = text.find('\0'); zero != text.npos; zero = text.find('\0')) {
@@ -143,31 +177,57 @@ class line_cutter {
     }
     line_ += text;
   }
+  /// Hands out the start of the line and keeps the rest.
+  void hand_out(std::size_t length) {
+    const std::string rest = line_.substr(length);
+    line_.resize(length);
+    if (!line_.empty()) process_.Output(line_.c_str());
+    line_ = rest;
+    length_ = rest.size();
+  }
 
   Port_Process& process_;
   std::string line_;
   std::size_t length_ = 0;  ///< of the line, as the child wrote it
 };
 
-/// Reads at most limit bytes from the pipe, once. Returns how many; 0 at the end of the output,
-/// -1 on failure.
-ssize_t read_once(int pipe, std::size_t limit, line_cutter& lines) {
-  char block[65536];
-  const ssize_t length = ::read(pipe, block, std::min(limit, sizeof block));
-  if (length > 0) lines.add({block, static_cast<std::size_t>(length)});
-  return length;
-}
+/// What is read from a child.
+class child_output {
+ public:
+  child_output(int pipe, Port_Process& process) : pipe_(pipe), process_(process), lines_(process) {}
 
-/// Reads what is in the pipe at this moment, and no more: its writer may never stop.
-void read_rest(int pipe, line_cutter& lines) {
-  int rest = 0;
-  ::ioctl(pipe, FIONREAD, &rest);
-  while (rest > 0) {
-    const ssize_t length = read_once(pipe, static_cast<std::size_t>(rest), lines);
-    if (length == 0 || (length < 0 && errno != EINTR)) return;
-    rest -= static_cast<int>(std::max<ssize_t>(length, 0));
+  /// Reads at most limit bytes, once, and hands out the lines. Returns how many; 0 at the end of
+  /// the output, -1 on failure.
+  ssize_t read_once(std::size_t limit) {
+    char block[line_cutter::LONGEST + 1];
+    const ssize_t length = ::read(pipe_, block, std::min(limit, line_cutter::LONGEST));
+    if (length > 0) {
+      lines_.add(block, static_cast<std::size_t>(length));
+      process_.Pause();
+    }
+    return length;
   }
-}
+  /// Reads what is in the pipe at this moment, and no more: its writer may never stop.
+  void read_rest() {
+    int rest = 0;
+    ::ioctl(pipe_, FIONREAD, &rest);
+    while (rest > 0) {
+      const ssize_t length = read_once(static_cast<std::size_t>(rest));
+      if (length == 0 || (length < 0 && errno != EINTR)) return;
+      rest -= static_cast<int>(std::max<ssize_t>(length, 0));
+    }
+  }
+  /// Hands out a last line without a line end.
+  void finish() {
+    lines_.flush();
+    process_.Pause();
+  }
+
+ private:
+  int pipe_;
+  Port_Process& process_;
+  line_cutter lines_;
+};
 
 /// Whether the child has ended. It stays to be reaped. option: 0 to wait until it has, or WNOHANG.
 bool has_ended(pid_t child, int option) {
@@ -183,7 +243,7 @@ bool has_ended(pid_t child, int option) {
 /// other process may hold the pipe longer: what is in the pipe when the child has ended is read,
 /// and no more is waited for.
 void pass_output(pid_t child, int pipe, Port_Process& process) {
-  line_cutter lines(process);
+  child_output output(pipe, process);
   // A descriptor that becomes readable when the child ends. A kernel without it has to be asked
   // from time to time.
   const descriptor end_of_child(static_cast<int>(::syscall(SYS_pidfd_open, child, 0)));
@@ -194,14 +254,14 @@ void pass_output(pid_t child, int pipe, Port_Process& process) {
     if (ready < 0 && errno != EINTR) break;
     const bool may_have_ended = end_of_child.get() < 0 || events[1].revents != 0;
     if (ready >= 0 && may_have_ended && has_ended(child, WNOHANG)) {
-      read_rest(pipe, lines);
+      output.read_rest();
       break;
     }
     if (ready <= 0 || events[0].revents == 0) continue;
-    const ssize_t length = read_once(pipe, SIZE_MAX, lines);
+    const ssize_t length = output.read_once(SIZE_MAX);
     if (length == 0 || (length < 0 && errno != EAGAIN && errno != EINTR)) break;
   }
-  lines.flush();
+  output.finish();
 }
 
 /// Keeps SIGCHLD at its default action: one that is ignored, or handled by collecting whichever
@@ -285,6 +345,7 @@ Port_Process::PROCESS_STATUS Port_Process::Run(const char* command) {
   }
   const default_child_signal while_it_runs;
   const child_start start(ends.write.get(), Port_Interrupt::own_groups());
+  Pause();
   pid_t child = 0;
   if (const int error = start.spawn(words, child)) return fail(words[0], std::strerror(error));
   Port_Interrupt::child_started(child);

@@ -27,10 +27,14 @@ class Port_Process {
   Port_Process& operator=(const Port_Process&) = delete;
 
   /// Gets each line that the program writes, in order, with its line end if it has one. A line
-  /// of more than 65536 characters comes in pieces of that length; a zero byte comes as the
-  /// character U+2400.
+  /// of more than 65536 bytes comes in pieces of that length, or up to 3 bytes less where it would
+  /// end inside a UTF-8 character; a zero byte comes as the character U+2400. The text is good
+  /// during the call only.
   virtual void Output(const char* text) = 0;
   virtual ~Port_Process() = default;
+  /// Called when there will be no Output for the moment: before the program starts, and when what
+  /// it has written so far has been handed out.
+  virtual void Pause() {}
 
   /// Starts the command line in the current directory, with the environment of the process and
   /// standard input from /dev/null, and returns when the program has ended, even if something

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <cstring>
 #include <exception>
 #include <iterator>
 #include <optional>
@@ -35,6 +36,19 @@ Port_MsgManData& message(int line = __builtin_LINE()) {
   return Port_MsgManData::createObject("Kestrel", "launcher/baslauncher.cpp", line, revision);
 }
 
+Port::FileStatus status_of(const char* path) {
+  return path != nullptr ? Port::File::status(path) : Port::FileStatus();
+}
+
+Port::FileStatus status_of(const LA_FULLFILE& file) {
+  return status_of(file.get_fullfile());
+}
+
+/// A full name without its directory.
+const char* tail_of(const char* path) {
+  return std::strrchr(path, '/') + 1;
+}
+
 /// The elements of an array that is kept with its count.
 template <class Element>
 std::span<Element> counted(const std::unique_ptr<Element[]>& array, short count) {
@@ -44,7 +58,11 @@ std::span<Element> counted(const std::unique_ptr<Element[]>& array, short count)
 }  // namespace
 
 void La_Port_Process::Output(const char* text) {
-  message().issueStatus("%s", text);
+  message().issueStatusText(text);
+}
+
+void La_Port_Process::Pause() {
+  Port_MsgManData::flush();
 }
 
 // ---- The launcher object ----
@@ -98,6 +116,7 @@ short LA_LAUNCHER::find(const char* name, char* source_path, char* netlist_path,
                         unsigned char top) {
   source_path[0] = '\0';
   netlist_path[0] = '\0';
+  netlist_seen = false;
   try {
     if (Port_Env::GetEnv("LA_DISABLE") != nullptr) return find_disabled(name, netlist_path);
     return find_enabled(name, source_path, netlist_path, top);
@@ -111,7 +130,7 @@ short LA_LAUNCHER::find(const char* name, char* source_path, char* netlist_path,
 }
 
 /// Looks for the name in lower case, without rules and messages.
-short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) const {
+short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) {
   char lower_name[LA_MAX_PATH];
   if (UT_STR::Copy(lower_name, name) == nullptr) return LA_NOT_FOUND;
   UT_STR::Lower(lower_name);
@@ -121,12 +140,28 @@ short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) const {
   for (const auto& dir : counted(searchpaths, num_searchpaths)) names.emplace_back(dir->get_dir());
   dirs.assign(names.begin(), names.end());
   const char* found = Port::File::find(lower_name, dirs.data(), num_searchpaths, netlist_path);
-  return found != nullptr ? LA_FOUND : LA_NOT_FOUND;
+  netlist_seen = found != nullptr;
+  return netlist_seen ? LA_FOUND : LA_NOT_FOUND;
 }
+
+/// The name that find was given, and where it looks for files of this name.
+struct LA_LAUNCHER::lookup {
+  explicit lookup(const LA_FULLFILE& given) : given(given), root(given.get_root()), beside(given) {}
+
+  /// The given name with another extension.
+  std::string file(const char* ext) const { return ext != nullptr ? root + "." + ext : root; }
+
+  const LA_FULLFILE& given;
+  const std::string root;  ///< head and name
+  LA_FULLROOT beside;      ///< where the name says
+};
 
 short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
                                 unsigned char top) {
-  LA_FULLFILE given(name);
+  home.set_dir(nullptr);
+  const char* current = home.get_dir();
+  home_name = current != nullptr ? current : "";
+  LA_FULLFILE given(home, name);
   bool named_kbc = false;
   if (given.match_ext("kbo")) {
     given.set_ext(nullptr);
@@ -138,18 +173,19 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
     return LA_FAILED;
   }
 
-  const LA_FILE target(".kbo");
-  LA_FULLFILE source;
+  lookup where(given);
+  in_searchpaths.clear();
+  found_file source;
   DARRAY_LA_RULE_CONST_PTR chain(3);
-  find_named(given);
+  find_named(where);
   std::vector<unsigned char> visited(static_cast<std::size_t>(rules->rules.count));
-  short result = plan_chain(given, target, visited.data(), source, chain);
+  short result = plan_chain(where, "kbo", visited.data(), source, chain);
   if (result == LA_FOUND) {
     result = build_chain(source, chain, top, netlist_path);
   } else if (result == LA_NOT_FOUND) {
-    result = find_native(given, named_kbc, source, netlist_path);
+    result = find_native(where, named_kbc, source, netlist_path);
   }
-  if (result == LA_FOUND) UT_STR::Copy(source_path, source.get_fullfile());
+  if (result == LA_FOUND) UT_STR::Copy(source_path, source.file.get_fullfile());
   return result;
 }
 
@@ -161,7 +197,7 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
     return false;
   }
   if (fits && given.get_fullfile() != nullptr) return true;
-  if (fits && LA_DIR(nullptr).get_dir() == nullptr) {
+  if (fits && home.get_dir() == nullptr) {
     message().issueError(
         "Launcher: The current directory cannot be used for netlist \"%s\": it is gone, too long, "
         "or has a backslash in its name.\n",
@@ -175,77 +211,91 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
 }
 
 /// Looks for the very file that the user named with an extension.
-void LA_LAUNCHER::find_named(const LA_FULLFILE& given) {
+void LA_LAUNCHER::find_named(lookup& where) {
   named_found = 0;
-  named_file.set_file();
-  if (given.get_ext() == nullptr) return;
-  named_found = find_file(given, named_file);
+  named_file.file.set_file();
+  const char* ext = where.given.get_ext();
+  if (ext == nullptr) return;
+  named_found = find_file(where, ext, named_file);
   if (named_found) return;
   message().issueWarning(
       "Launcher: Could not find file %s with extension %s in the search path. Ignoring "
       "extension.\n",
-      given.get_fullroot(), given.get_ext());
+      where.given.get_fullroot(), ext);
   ++warnings;
 }
 
 /// Looks for a file that needs no rule: .kbo, then .kbc; only .kbc when the user asked for that.
-short LA_LAUNCHER::find_native(const LA_FULLFILE& given, bool named_kbc, LA_FULLFILE& source,
+short LA_LAUNCHER::find_native(lookup& where, bool named_kbc, found_file& source,
                                char* netlist_path) {
-  LA_FULLFILE candidate(given);
-  if (!named_kbc) candidate.set_ext("kbo");
-  bool is_kbo = !named_kbc;
-  if (!find_file(candidate, source)) {
-    candidate.set_ext("kbc");
-    is_kbo = false;
-    if (!find_file(candidate, source)) return LA_NOT_FOUND;
-  }
-  if (is_kbo) {
+  const char* ext = named_kbc ? where.given.get_ext() : "kbo";
+  const bool found_first = find_file(where, ext, source);
+  if (!found_first && !find_file(where, "kbc", source)) return LA_NOT_FOUND;
+  if (found_first && !named_kbc) {
     message().issueStatus("Launcher: NOT compiling %s because its source was not found\n",
-                          candidate.get_tail());
+                          source.file.get_tail());
   }
-  UT_STR::Copy(netlist_path, source.get_fullfile());
+  UT_STR::Copy(netlist_path, source.file.get_fullfile());
+  netlist_seen = true;
   return LA_FOUND;
 }
 
 // ---- Search-path resolution ----
 
+/// What the file system knows of a file while the current directory is home. Below it, a name is
+/// looked up from there: that spares the file system the way down to it.
+Port::FileStatus LA_LAUNCHER::status_at_home(const char* path) const {
+  const bool is_below = path != nullptr && std::string_view(path).starts_with(home_name) &&
+                        path[home_name.size()] != '/';
+  return status_of(is_below ? path + home_name.size() : path);
+}
+
 /// Looks where the name says, then in the search directories.
-bool LA_LAUNCHER::find_file(const LA_FULLFILE& given, LA_FULLFILE& found) {
-  const bool exists = given.exists();
-  note(given, exists ? LA_EXPLANATION::FOUND : LA_EXPLANATION::MISSING);
-  if (!exists) return find_in_searchpaths(given, found);
-  found = given;
+bool LA_LAUNCHER::find_file(lookup& where, const char* ext, found_file& found) {
+  const char* path = where.beside.with_ext(ext);
+  const Port::FileStatus status = status_at_home(path);
+  note(path, status.exists ? LA_EXPLANATION::FOUND : LA_EXPLANATION::MISSING);
+  if (!status.exists) return find_in_searchpaths(where, ext, found);
+  found = {where.given, status};
+  found.file.set_ext(ext);
   return true;
 }
 
 /// Adds a place where a file was looked for to the explanation.
-void LA_LAUNCHER::note(const LA_FULLFILE& file, LA_EXPLANATION::SIGHTING sighting) const {
-  if (explanation == nullptr || file.get_fullfile() == nullptr) return;
-  explanation->probes.push_back({sighting, file.get_fullfile()});
+void LA_LAUNCHER::note(const char* path, LA_EXPLANATION::SIGHTING sighting) const {
+  if (explanation != nullptr && path != nullptr) explanation->probes.push_back({sighting, path});
 }
 
 /// Looks in the search directories. All of them are visited, so that the report on files passed
 /// over is complete. found is written only when there is one.
-unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULLFILE& found) {
-  const la_text file(given.get_file());
+unsigned char LA_LAUNCHER::find_in_searchpaths(lookup& where, const char* ext, found_file& found) {
+  const auto dirs = counted(searchpaths, num_searchpaths);
+  if (in_searchpaths.size() < dirs.size()) {
+    // A head may begin with a drive, which is dropped.
+    const LA_FILE relative((where.root + ".").c_str());
+    const char* root = relative.get_root();
+    in_searchpaths.reserve(dirs.size());
+    for (const auto& dir : dirs) in_searchpaths.emplace_back(*dir, root);
+  }
   bool found_any = false;
   Port::StringBase<char> first;
   Port::StringBase<char> others;
-  for (const auto& dir : counted(searchpaths, num_searchpaths)) {
-    const LA_FULLFILE candidate(*dir, file);
-    if (!candidate.exists()) {
-      note(candidate, LA_EXPLANATION::MISSING);
+  for (std::size_t i = 0; i < dirs.size(); ++i) {
+    const char* path = in_searchpaths[i].with_ext(ext);
+    const Port::FileStatus status = status_at_home(path);
+    if (!status.exists) {
+      note(path, LA_EXPLANATION::MISSING);
       continue;
     }
-    const Port::StringBase<char> name(candidate.get_fullfile());
+    const Port::StringBase<char> name(path);
     if (!found_any) {
-      note(candidate, LA_EXPLANATION::FOUND);
-      found = candidate;
+      note(path, LA_EXPLANATION::FOUND);
+      found = {LA_FULLFILE(*dirs[i], where.file(ext).c_str()), status};
       first = name;
       found_any = true;
     } else if (!(name == first) && others.GetIndexOfString(name, Port::StringBase<char>::EXACT) ==
                                        Port::StringBase<char>::NOT_FOUND) {
-      note(candidate, LA_EXPLANATION::PASSED_OVER);
+      note(path, LA_EXPLANATION::PASSED_OVER);
       others += "\t";
       others += name;
       others += "\n";
@@ -256,7 +306,7 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULL
         "Found resolution for '%s' using the search path (-sd switches):\n\t%s\nOther matching "
         "files found later in the search path will not be used:\n%sEnsure that the correct file "
         "is used by modifying the search path order.\n",
-        file.get(), first.c_str(), others.c_str());
+        where.file(ext).c_str(), first.c_str(), others.c_str());
   }
   return found_any;
 }
@@ -271,9 +321,8 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(const LA_FULLFILE& given, LA_FULL
 /// its path, or it would have ended in a loop report. So none of those rules leads to it, from
 /// wherever it is wanted next, and the outcome is again that there is no such file. Only another
 /// spelling of the extension is another file.
-short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
-                              unsigned char* visited, LA_FULLFILE& source,
-                              DARRAY_LA_RULE_CONST_PTR& chain) {
+short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* visited,
+                              found_file& source, DARRAY_LA_RULE_CONST_PTR& chain) {
   /// The producers of one extension, and which of them is being tried.
   struct level {
     const std::vector<int>* producers;
@@ -282,7 +331,9 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
     int rule() const { return (*producers)[tried]; }
   };
   const auto producers_of = [this](int extension) { return &index->producers(extension); };
-  std::vector<level> path = {{producers_of(index->extension(wanted.get_ext())), 0}};
+  std::vector<level> path;
+  path.reserve(8);  // Few chains are longer.
+  path.push_back({producers_of(index->extension(wanted)), 0});
   std::vector<bool> failed(index->num_spellings());
 
   while (path.back().tried < path.back().producers->size() || path.size() > 1) {
@@ -291,7 +342,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
       path.pop_back();
       const int needing = path.back().rule();
       visited[needing] = 0;
-      if (find_input(given, *rules->rules.elements[needing], source)) {
+      if (find_input(where, *rules->rules.elements[needing], source)) {
         for (auto used = path.rbegin(); used != path.rend(); ++used) {
           visited[used->rule()] = 0;
           chain.append(rules->rules.elements[used->rule()]);
@@ -319,7 +370,7 @@ short LA_LAUNCHER::plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted,
       return LA_FAILED;
     }
     const char* only_name = rule.netlist_file->get_name();
-    const bool for_another = only_name != nullptr && !given.match_name(only_name);
+    const bool for_another = only_name != nullptr && !where.given.match_name(only_name);
     if (for_another || failed[index->spelling(i)]) {
       note(i, for_another   ? LA_EXPLANATION::FOR_ANOTHER_NAME
               : named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED
@@ -339,16 +390,12 @@ void LA_LAUNCHER::note(int rule, LA_EXPLANATION::VERDICT verdict) const {
 }
 
 /// Looks for the file that a rule reads. Where the user named a file, it is that or none.
-bool LA_LAUNCHER::find_input(const LA_FULLFILE& given, const LA_RULE& rule, LA_FULLFILE& source) {
+bool LA_LAUNCHER::find_input(lookup& where, const LA_RULE& rule, found_file& source) {
   const char* ext = rule.netlist_file->get_ext();
-  if (named_found) {
-    if (!named_file.match_ext(ext)) return false;
-    source = named_file;
-    return true;
-  }
-  LA_FULLFILE candidate(given);
-  candidate.set_ext(ext);
-  return find_file(candidate, source);
+  if (!named_found) return find_file(where, ext, source);
+  if (!named_file.file.match_ext(ext)) return false;
+  source = named_file;
+  return true;
 }
 
 void LA_LAUNCHER::report_loop(const unsigned char* visited) {
@@ -383,23 +430,17 @@ constexpr decision_report REPORTS[] = {
      "Launcher: %s being compiled because the time stamps could not be determined\n"},
 };
 
-Port::FileStatus status_of(const LA_FULLFILE& file) {
-  const char* path = file.get_fullfile();
-  return path != nullptr ? Port::File::status(path) : Port::FileStatus();
-}
-
 }  // namespace
 
 /// The step of a chain that is being carried out. decision moves on from step to step.
 struct LA_LAUNCHER::build_step {
   const LA_FULLFILE& source;
   const LA_RULE* rule;
-  LA_FULLFILE input;
-  LA_FULLFILE output;
+  const LA_RULE* rule_before;  ///< whose output is the input; null in the first step
+  const char* output;
   LA_BUILD_DECISION decision;
-  /// What is known of the files. The output of a step that did not run is, as the input of the
-  /// next one, not asked for again.
-  std::optional<Port::FileStatus> input_status = std::nullopt;
+  /// What is known of the files. None is asked for twice, if no netlister runs.
+  Port::FileStatus input_status;
   Port::FileStatus output_status = {};
   /// The dependency file that is newer than the output.
   std::string dependency = {};
@@ -409,7 +450,8 @@ struct LA_LAUNCHER::build_step {
 /// The current directory of the process during a chain: back home at its end, whatever happens.
 class LA_LAUNCHER::working_directory {
  public:
-  working_directory() : home_(nullptr) {}
+  /// home: the directory that is current.
+  explicit working_directory(const LA_DIR& home) : home_(home) {}
   working_directory(const working_directory&) = delete;
   working_directory& operator=(const working_directory&) = delete;
   ~working_directory() {
@@ -417,34 +459,45 @@ class LA_LAUNCHER::working_directory {
     if (left_ && !left_->enter()) home_.chdir();
   }
 
-  /// The directory that was current when the chain started.
-  const LA_DIR& home() const { return home_; }
   void enter(const LA_DIR& directory) {
     if (!left_) left_.emplace();
     directory.chdir();
   }
 
  private:
-  const LA_DIR home_;
+  const LA_DIR& home_;
   std::optional<Port::Place> left_;
 };
 
-short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
-                               unsigned char top, char* netlist_path) {
-  la_command_options options;
-  set_options(options);
+/// What the runs of a chain have in common.
+struct LA_LAUNCHER::shared_by_runs {
+  explicit shared_by_runs(const LA_LAUNCHER& launcher) : directory(launcher.home) {
+    launcher.set_options(options);
+  }
+
   working_directory directory;
-  build_step step = {source, nullptr, source, LA_FULLFILE(*output_dir, source.get_tail()),
-                     force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED};
+  la_command_options options;
+};
+
+short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
+                               unsigned char top, char* netlist_path) {
+  std::optional<shared_by_runs> shared;
+  // A device table that is damaged, which makes the rules invalid, is reported before the steps.
+  if (!ok) shared.emplace(*this);
+  const LA_FILE tail(source.file.get_tail());
+  LA_FULLROOT outputs(*output_dir, tail.get_root());
+  build_step step = {
+      source.file,  nullptr, nullptr, nullptr, force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED,
+      source.status};
   for (const LA_RULE* rule : chain) {
-    step.rule = rule;
+    step.rule_before = std::exchange(step.rule, rule);
     if (detail) message().issueStatus("Launcher: Using rule %s\n", rule->rule_name.get());
-    step.output.set_ext(rule->target->get_ext());
-    if (step.output.get_fullfile() == nullptr) {
+    step.output = outputs.with_ext(rule->target->get_ext());
+    if (step.output == nullptr) {
       message().issueError(
           "Launcher: The output of rule %s for %s has no name of at most %d characters in the "
           "output directory.\n",
-          rule->rule_name.get(), source.get_tail(), LA_MAX_PATH - 1);
+          rule->rule_name.get(), source.file.get_tail(), LA_MAX_PATH - 1);
       ++errors;
       return LA_FAILED;
     }
@@ -452,14 +505,26 @@ short LA_LAUNCHER::build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_C
     note(step);
     if (!report_decision(step)) return LA_FAILED;
     if (step.decision > LA_BUILD_UNDECIDED) {
-      if (!run_netlister(step, directory, options, top)) return LA_FAILED;
+      if (!shared) shared.emplace(*this);
+      if (!run_netlister(step, *shared, top)) return LA_FAILED;
       step.decision = LA_BUILD_AFTER_REBUILD;
     }
-    step.input = step.output;
     step.input_status = step.output_status;
   }
-  UT_STR::Copy(netlist_path, step.output.get_fullfile());
+  UT_STR::Copy(netlist_path, step.output);
+  netlist_seen = step.decision < LA_BUILD_UNDECIDED;
   return LA_FOUND;
+}
+
+/// The file that a rule of a chain makes.
+LA_FULLFILE LA_LAUNCHER::output_of(const LA_FULLFILE& source, const LA_RULE& rule) const {
+  LA_FULLFILE output(*output_dir, source.get_tail());
+  output.set_ext(rule.target->get_ext());
+  return output;
+}
+
+LA_FULLFILE LA_LAUNCHER::input_of(const build_step& step) const {
+  return step.rule_before != nullptr ? output_of(step.source, *step.rule_before) : step.source;
 }
 
 /// Sets every keyword but those of a step's files.
@@ -509,7 +574,7 @@ void LA_LAUNCHER::decide(build_step& step) const {
     return;
   }
   if (step.decision == LA_BUILD_FORCED || step.decision == LA_BUILD_AFTER_REBUILD) return;
-  step.output_status = status_of(step.output);
+  step.output_status = status_at_home(step.output);  // No netlister has run yet.
   if (!step.output_status.exists) {
     step.decision = LA_BUILD_MISSING;
     return;
@@ -518,10 +583,9 @@ void LA_LAUNCHER::decide(build_step& step) const {
     step.decision = LA_BUILD_SKIPPED;
     return;
   }
-  if (!step.input_status) step.input_status = status_of(step.input);
-  if (!step.input_status->exists) {
+  if (!step.input_status.exists) {
     step.decision = LA_BUILD_NO_TIMESTAMP;
-  } else if (step.input_status->time > step.output_status.time) {
+  } else if (step.input_status.time > step.output_status.time) {
     step.decision = LA_BUILD_OUT_OF_DATE;
   } else {
     step.decision = decide_by_dependency_files(step);
@@ -531,9 +595,9 @@ void LA_LAUNCHER::decide(build_step& step) const {
 /// Adds the step to the explanation.
 void LA_LAUNCHER::note(const build_step& step) const {
   if (explanation == nullptr) return;
-  explanation->steps.push_back({step.rule, step.input.get_fullfile(), step.output.get_fullfile(),
-                                step.input_status.value_or(Port::FileStatus()), step.output_status,
-                                step.dependency, step.dependency_status, step.decision, ""});
+  explanation->steps.push_back({step.rule, input_of(step).get_fullfile(), step.output,
+                                step.input_status, step.output_status, step.dependency,
+                                step.dependency_status, step.decision, ""});
 }
 
 /// Reports the decision. False when it ends the chain.
@@ -541,14 +605,14 @@ bool LA_LAUNCHER::report_decision(const build_step& step) {
   if (step.decision == LA_BUILD_UNSUPPORTED) {
     message().issueError(
         "Launcher: Netlist format of %s is no longer supported, could not create %s\n",
-        step.input.get_fullfile(), step.output.get_tail());
+        input_of(step).get_fullfile(), tail_of(step.output));
     ++errors;
     return false;
   }
   for (const decision_report& report : REPORTS) {
     if (report.decision != step.decision || (report.only_detail && !detail)) continue;
-    const bool gone = step.decision == LA_BUILD_AFTER_REBUILD && !step.output.exists();
-    message().issueStatus(gone ? MISSING : report.text, step.output.get_tail());
+    const bool gone = step.decision == LA_BUILD_AFTER_REBUILD && !status_of(step.output).exists;
+    message().issueStatus(gone ? MISSING : report.text, tail_of(step.output));
   }
   return true;
 }
@@ -568,9 +632,9 @@ std::string argument_of(const LA_FULLFILE& file) {
 }  // namespace
 
 /// Runs the step's netlister and judges how it ended. False when the chain ends here.
-bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& directory,
-                                la_command_options& options, unsigned char top) {
-  if (directory.home().get_dir() == nullptr) {
+bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, unsigned char top) {
+  auto& [directory, options] = shared;
+  if (home.get_dir() == nullptr) {
     message().issueError(
         "Launcher: The current directory is gone, too long, or has a backslash in its name: %s is "
         "not run.\n",
@@ -578,9 +642,11 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& direc
     ++errors;
     return false;
   }
-  enter_directory(step, directory);
+  const LA_FULLFILE input = input_of(step);
+  const LA_FULLFILE output = output_of(step.source, *step.rule);
+  enter_directory(*step.rule, input, output, directory);
   std::string command;
-  if (!make_command(step, options, top, command)) return false;
+  if (!make_command(*step.rule, input, output, options, top, command)) return false;
   message().issueStatus("Launcher: Executing %s\n", command.c_str());
   if (explanation != nullptr) explanation->steps.back().command = command;
   if (Port_Env::GetEnv("LA_TEST") != nullptr) return true;
@@ -592,37 +658,37 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, working_directory& direc
 
 /// Sees to it that what a failed run has written is not taken for up to date later: it gets the
 /// oldest time stamp that there is. Its content stays for whoever wants to look into it.
-void LA_LAUNCHER::distrust(const LA_FULLFILE& output, const Port::FileStatus& before) {
+void LA_LAUNCHER::distrust(const char* output, const Port::FileStatus& before) {
   const Port::FileStatus after = status_of(output);
   if (!after.exists || (before.exists && after.time == before.time)) return;
-  if (!Port::File::setoldest(output.get_fullfile())) {
+  if (!Port::File::setoldest(output)) {
     message().issueWarning(
         "Launcher: %s comes from a failed run, and its time stamp could not be set back: remove "
         "it\n",
-        output.get_tail());
+        tail_of(output));
     ++warnings;
   } else if (detail) {
     message().issueStatus(
         "Launcher: %s comes from a failed run, its time stamp is set back: it will be made again\n",
-        output.get_tail());
+        tail_of(output));
   }
 }
 
 /// Goes to the directory that the rule asks for. Where it cannot be entered, the netlister runs
 /// where the process stands.
-void LA_LAUNCHER::enter_directory(const build_step& step, working_directory& directory) const {
-  const LA_RULE& rule = *step.rule;
+void LA_LAUNCHER::enter_directory(const LA_RULE& rule, const LA_FULLFILE& input,
+                                  const LA_FULLFILE& output, working_directory& directory) const {
   const char* name = nullptr;
   switch (rule.netlister_dir_flag) {
     case DIR_UNSET:
     case DIR_NONE:
-      name = directory.home().get_dir();
+      name = home.get_dir();
       break;
     case DIR_SOURCE:
-      name = step.input.get_fullhead();
+      name = input.get_fullhead();
       break;
     case DIR_OUTPUT:
-      name = step.output.get_fullhead();
+      name = output.get_fullhead();
       break;
     default:
       name = rule.netlister_dir ? rule.netlister_dir->get_dir() : nullptr;
@@ -641,18 +707,18 @@ void LA_LAUNCHER::enter_directory(const build_step& step, working_directory& dir
 }
 
 /// Makes the command line of the step.
-bool LA_LAUNCHER::make_command(const build_step& step, la_command_options& options,
+bool LA_LAUNCHER::make_command(const LA_RULE& rule, const LA_FULLFILE& input,
+                               const LA_FULLFILE& output, la_command_options& options,
                                unsigned char top, std::string& command) {
-  const LA_RULE& rule = *step.rule;
   const char* options_template = top && rule.netlister_top_options != nullptr
                                      ? rule.netlister_top_options
                                      : rule.netlister_options;
   if (options_template == nullptr) options_template = "";
-  const std::string infile = argument_of(step.input);
-  const std::string outfile = argument_of(step.output);
+  const std::string infile = argument_of(input);
+  const std::string outfile = argument_of(output);
   if (infile.empty() || outfile.empty()) {
     message().issueError("Launcher: The name of %s is too long for a command line.\n",
-                         infile.empty() ? step.input.get_tail() : step.output.get_tail());
+                         infile.empty() ? input.get_tail() : output.get_tail());
     ++errors;
     return false;
   }

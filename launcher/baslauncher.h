@@ -4,6 +4,7 @@
 
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "file/baslafile.h"
 #include "host/port_process.h"
@@ -30,6 +31,8 @@ class La_Port_Process : public Port_Process {
   explicit La_Port_Process(int mode) : Port_Process(mode) {}
   /// Issues text as a status message, with no regard to any "%" in it.
   void Output(const char* text) override;
+  /// Tells the message manager.
+  void Pause() override;
 };
 
 /// One launcher serves any number of find calls, all from one thread. While a netlister runs, the
@@ -71,6 +74,9 @@ class LA_LAUNCHER {
   /// to read may not exist; LA_DISABLE looks for the name in lower case in the search directories
   /// and does nothing else: no rules, no messages, and source_path stays empty.
   short find(const char* name, char* source_path, char* netlist_path, unsigned char top);
+  /// Whether the last find that returned LA_FOUND has seen the file to read. If not, a netlister
+  /// was to write it, whose exit code was good.
+  bool saw_netlist() const { return netlist_seen; }
   /// Appends search directories, to be searched after those that there are. A relative name is
   /// relative to the current directory of this moment. More than 32767 in all are refused, with an
   /// error message.
@@ -91,38 +97,47 @@ class LA_LAUNCHER {
   int warnings = 0;
 
  private:
-  short find_disabled(const char* name, char* netlist_path) const;
+  short find_disabled(const char* name, char* netlist_path);
   short find_enabled(const char* name, char* source_path, char* netlist_path, unsigned char top);
   bool is_usable(const LA_FULLFILE& given, const char* name);
-  void find_named(const LA_FULLFILE& given);
-  short find_native(const LA_FULLFILE& given, bool named_kbc, LA_FULLFILE& source,
-                    char* netlist_path);
-  bool find_file(const LA_FULLFILE& given, LA_FULLFILE& found);
-  void note(const LA_FULLFILE& file, LA_EXPLANATION::SIGHTING sighting) const;
-  unsigned char find_in_searchpaths(const LA_FULLFILE& given, LA_FULLFILE& found);
+  /// A file, and what was known of it when it was found.
+  struct found_file {
+    LA_FULLFILE file;
+    Port::FileStatus status;
+  };
+  struct lookup;
+  void find_named(lookup& where);
+  short find_native(lookup& where, bool named_kbc, found_file& source, char* netlist_path);
+  Port::FileStatus status_at_home(const char* path) const;
+  bool find_file(lookup& where, const char* ext, found_file& found);
+  void note(const char* path, LA_EXPLANATION::SIGHTING sighting) const;
+  unsigned char find_in_searchpaths(lookup& where, const char* ext, found_file& found);
 
-  short plan_chain(const LA_FULLFILE& given, const LA_FILE& wanted, unsigned char* visited,
-                   LA_FULLFILE& source, DARRAY_LA_RULE_CONST_PTR& chain);
+  short plan_chain(lookup& where, const char* wanted, unsigned char* visited, found_file& source,
+                   DARRAY_LA_RULE_CONST_PTR& chain);
   void note(int rule, LA_EXPLANATION::VERDICT verdict) const;
-  bool find_input(const LA_FULLFILE& given, const LA_RULE& rule, LA_FULLFILE& source);
+  bool find_input(lookup& where, const LA_RULE& rule, found_file& source);
   void report_loop(const unsigned char* visited);
 
   struct build_step;
   class working_directory;
-  short build_chain(const LA_FULLFILE& source, const DARRAY_LA_RULE_CONST_PTR& chain,
+  struct shared_by_runs;
+  short build_chain(const found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
                     unsigned char top, char* netlist_path);
+  LA_FULLFILE output_of(const LA_FULLFILE& source, const LA_RULE& rule) const;
+  LA_FULLFILE input_of(const build_step& step) const;
   void set_options(la_command_options& options) const;
   void decide(build_step& step) const;
   static LA_BUILD_DECISION decide_by_dependency_files(build_step& step);
   void note(const build_step& step) const;
   bool report_decision(const build_step& step);
-  bool run_netlister(const build_step& step, working_directory& directory,
-                     la_command_options& options, unsigned char top);
-  void enter_directory(const build_step& step, working_directory& directory) const;
-  bool make_command(const build_step& step, la_command_options& options, unsigned char top,
-                    std::string& command);
+  bool run_netlister(const build_step& step, shared_by_runs& shared, unsigned char top);
+  void enter_directory(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
+                       working_directory& directory) const;
+  bool make_command(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
+                    la_command_options& options, unsigned char top, std::string& command);
   bool execute(const LA_RULE& rule, const std::string& command);
-  void distrust(const LA_FULLFILE& output, const Port::FileStatus& before);
+  void distrust(const char* output, const Port::FileStatus& before);
 
   la_text part_name;
   std::unique_ptr<LA_DIR> output_dir;
@@ -137,7 +152,13 @@ class LA_LAUNCHER {
   la_text quiet;
   la_text aul;
   unsigned char named_found = 0;
-  LA_FULLFILE named_file;
+  bool netlist_seen = false;
+  found_file named_file;
+  /// Where this find looks for its name in the search directories; none before that is needed. Kept
+  /// for the sake of its memory.
+  std::vector<LA_FULLROOT> in_searchpaths;
+  LA_DIR home;            ///< the current directory when this find began
+  std::string home_name;  ///< its name, with "/" at its end; empty when it has none
   std::unique_ptr<LA_RULE_SET> rules;
   std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions
   LA_EXPLANATION* explanation = nullptr;

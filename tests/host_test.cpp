@@ -166,3 +166,15 @@ x 'y                           | x 'y: a quote is without its partner)");
   EXPECT_EQ(descriptors(), before);
   for (const int number : {SIGCHLD, SIGTERM}) ::signal(number, SIG_DFL);
 }
+
+TEST_F(Host, LongLinesInPieces) {
+  const std::string piece(65536, '0');
+  const std::string pieces = piece + "/" + piece + "\n/" + piece + "/0/";
+  EXPECT_EQ(ran("printf %0131072d\\n%065537d 0 0"), "0: " + pieces);
+  for (const std::size_t kept :
+       {65533u, 65534u, 65535u}) {  // With room for 3, 2, 1 bytes of three.
+    const std::string zeros(kept, '0');
+    EXPECT_EQ(ran("printf %0" + std::to_string(kept) + "d\\342\\202\\254\\n 0"),
+              "0: " + zeros + (kept > 65533 ? "/" : "") + "\u20ac\n/");
+  }
+}

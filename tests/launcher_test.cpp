@@ -1,5 +1,6 @@
 // The launcher: what find hands back, what it says, and what it runs.
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <algorithm>
 #include <array>
@@ -11,6 +12,24 @@
 #include "cli/settings.h"
 #include "launcher/baslauncher.h"
 #include "support.h"
+
+// The questions to the system, counted: the linker puts these in the way.
+static int status_calls = 0;
+static int directory_calls = 0;
+// NOLINTBEGIN(bugprone-reserved-identifier)
+extern "C" {
+int __real_stat(const char* path, struct stat* status);
+int __wrap_stat(const char* path, struct stat* status) {
+  ++status_calls;
+  return __real_stat(path, status);
+}
+char* __real_getcwd(char* buffer, std::size_t size);
+char* __wrap_getcwd(char* buffer, std::size_t size) {
+  ++directory_calls;
+  return __real_getcwd(buffer, size);
+}
+}
+// NOLINTEND(bugprone-reserved-identifier)
 
 namespace {
 
@@ -265,6 +284,58 @@ TEST(Plan, DoesWhatANaivePlannerDoes) {
       ASSERT_EQ(found, naive.find()) << text << named << testing::PrintToString(naive.files);
     }
   }
+}
+
+// Of each name: the result, whether the file to read was seen, and how often the system was asked
+// for files and for the current directory. Four places are searched.
+TEST(Plan, AsksForEachFileOnce) {
+  World world(
+      "RULES=a,b; a=.edf,.kbo,.x,nl,,out=$outfile $infile,,,,0; "
+      "b=.sch,.edf,,nl,,out=$outfile,,,,0");
+  world.tree.make(
+      "r/ s/up.sch@1 up.edf@2 up.kbo@3 s/one.edf@2 s/one.x@1 one.kbo@1 s/two.sch e.kbc");
+  const Variable path("PATH", world.tree.full("bin").c_str());
+  const char* dirs[] = {"r", "s", "t"};
+  LA_LAUNCHER launcher(nullptr, dirs, 3, nullptr, 0, nullptr, nullptr, 0, 0, 0, 0, 0, 0);
+  for (const auto& row : table(R"(
+up     | 0 1 7 1   | source 4, outputs 2, dependency 1
+up.sch | 0 1 7 1   | the same
+one    | 0 0 10 3  | sources 8, output 1, and 1 before it is made; names in the command 2
+two    | 0 0 7 5   | source 4, output 1, and 2 before they are made; names in the commands 4
+e      | 0 1 13 1  | sources 8, .kbo 4, .kbc 1
+no     | 1 0 16 1  | sources 8, .kbo 4, .kbc 4
+no.edf | 1 0 20 1  | the name 4, and as before
+/no    | 1 0 16 1  | as for no)")) {
+    status_calls = directory_calls = 0;
+    char source[LA_MAX_PATH], netlist[LA_MAX_PATH];
+    const short result = launcher.find(row[0].c_str(), source, netlist, 1);
+    std::ostringstream counts;
+    counts << result << ' ' << launcher.saw_netlist() << ' ' << status_calls << ' '
+           << directory_calls;
+    EXPECT_EQ(counts.str(), row[1]) << row[0] << ": " << row[2];
+  }
+}
+
+// From each of five extensions to each of the next layer.
+TEST(Plan, ConsidersEachRuleOnce) {
+  std::string names = "RULES=", rules;
+  int count = 0;
+  for (int layer = 0; layer < 8; ++layer) {
+    for (int i = 0; i < (layer < 7 ? 25 : 5); ++i, ++count) {
+      const std::string to = layer < 7 ? "e" + std::to_string(10 * layer + 10 + i / 5) : "kbo";
+      const std::string name = "r" + std::to_string(count);
+      names += (count > 0 ? "," : "") + name;
+      rules += "; " + name + "=.e" + std::to_string(10 * layer + i % 5) + ",." + to + ",,nl,,,,,,0";
+    }
+  }
+  const World world(names + rules);
+  LA_LAUNCHER launcher(nullptr, nullptr, 0, nullptr, 0, nullptr, nullptr, 0, 0, 0, 0, 0, 0);
+  LA_EXPLANATION why;
+  launcher.explain_to(&why);
+  char source[LA_MAX_PATH], netlist[LA_MAX_PATH];
+  EXPECT_EQ(launcher.find("d", source, netlist, 1), LA_NOT_FOUND);
+  EXPECT_EQ(why.rules.size(), count);
+  EXPECT_EQ(why.probes.size(), 8 * 5 + 2);  // and .kbo, .kbc
 }
 
 TEST(Build, DecidesByFlagsAndTimeStamps) {

@@ -136,6 +136,24 @@ TEST_F(Guest, IsInterruptedByItsHost) {
   Port_MsgManData::setSink(before);
 }
 
+// Messages and results go to one file here. The second command says "now" and sleeps.
+TEST_F(Guest, ACommandShowsMessagesInOrderAndAtOnce) {
+  const std::string command = KESTREL_LAUNCH, again = "Launcher: d.edf is up to date\n";
+  run({"/bin/sh", "-c", command + " --not-top -l say=a d d >log 2>&1"});
+  EXPECT_EQ(tree.shorten(tree.read("log")),
+            "Launcher: Executing nl out=\"d.edf\"\nLauncher: Executing nl say=a out=\"d.kbo\"\n"
+            "a\n~/d.kbo\n" +
+                again + "Launcher: d.kbo is up to date\n~/d.kbo\n");
+  tree.remove("d.kbo");
+  std::string seen;
+  run({"/bin/sh", "-c", "exec " + command + " -l say=now d >log 2>&1"}, "", [&](pid_t launch) {
+    for (int i = 0; i < 20'000 && !seen.ends_with("now\n"); ++i, ::usleep(1000))
+      seen = tree.read("log");
+    ::kill(launch, SIGTERM);
+  });
+  EXPECT_EQ(seen, again + "Launcher: Executing nl say=now out=\"d.kbo\" sleep=60000\nnow\n");
+}
+
 // The signals come when the last netlister of a chain has begun to write its output.
 TEST_F(Guest, AnInterruptedCommandEndsWhatItStarted) {
   for (const int number : {SIGINT, SIGTERM, SIGHUP, SIGQUIT}) ::signal(number, SIG_DFL);
