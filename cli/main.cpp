@@ -42,14 +42,17 @@ std::string read_names(const std::string& file, std::vector<std::string>& names)
   const bool from_input = file == "-";
   if (!from_input) opened.open(file);
   std::istream& in = from_input ? std::cin : opened;
-  std::string line;
-  for (int number = 1; in && std::getline(in, line); ++number) {
-    if (line.ends_with('\r')) line.pop_back();
-    if (line.find('\0') != line.npos) {
+  char line[4096];
+  for (int number = 1; in.getline(line, sizeof line); ++number) {
+    std::string name(line, static_cast<std::size_t>(in.gcount()) - (in.eof() ? 0 : 1));
+    if (name.ends_with('\r')) name.pop_back();
+    if (name.find('\0') != name.npos) {
       return "--names-from: " + file + ", line " + std::to_string(number) + " holds a zero byte";
     }
-    if (!line.empty()) names.push_back(line);
+    if (!name.empty()) names.push_back(std::move(name));
   }
+  if (in.gcount() == sizeof line - 1)
+    return "--names-from: " + file + " holds a line that is too long";
   return in.eof() ? "" : "--names-from: could not read " + file;
 }
 
@@ -118,6 +121,41 @@ LA_LAUNCHER launcher_of(settings& set) {
           set.aul};
 }
 
+/// What the names came to.
+struct tally {
+  int built = 0;
+  int up_to_date = 0;
+  int not_found = 0;
+  int failed = 0;
+
+  void add(short result, bool is_built) {
+    ++(result == LA_FAILED      ? failed
+       : result == LA_NOT_FOUND ? not_found
+       : is_built               ? built
+                                : up_to_date);
+  }
+  /// Tells it, where there was more than one name.
+  void tell(std::size_t names) const {
+    const int tried = built + up_to_date + not_found + failed;
+    if (names < 2) return;
+    std::string text = std::to_string(names) + " names:";
+    const struct {
+      int number;
+      const char* what;
+    } counts[] = {{built, is_dry_run() ? "to be built" : "built"},
+                  {up_to_date, "up to date"},
+                  {not_found, "not found"},
+                  {failed, "failed"},
+                  {static_cast<int>(names) - tried, "not tried"}};
+    for (const auto& [number, what] : counts) {
+      if (number > 0)
+        text.append(" ").append(std::to_string(number)).append(" ").append(what) += ',';
+    }
+    text.pop_back();
+    complain(text);
+  }
+};
+
 /// The exit status after one more name.
 int worse(int status, short result) {
   return std::max(status, result == LA_FAILED      ? int{FAILED}
@@ -125,9 +163,23 @@ int worse(int status, short result) {
                                                    : int{ALL_FOUND});
 }
 
+/// Whether netlisters that say that they have done their work have written the file to read.
+bool is_written(const char* source, const char* netlist) {
+  const Port::FileStatus status = Port::File::status(netlist);
+  if (!status.exists) {
+    const bool is_directory = Port::File::isdirectory(netlist);
+    complain(is_directory ? std::string(netlist) + " is a directory"
+                          : std::string("no netlister has written ") + netlist);
+  } else if (status.time < Port::File::status(source).time) {
+    complain(std::string(netlist) + " is older than its source: has its netlister written it?");
+  }
+  return status.exists;
+}
+
 int resolve(settings& set, const console& shown) {
   LA_LAUNCHER launcher = launcher_of(set);
   int status = launcher.ok ? ALL_FOUND : FAILED;
+  tally counted;
   const signal_handling while_it_resolves;
   const auto goes_on = [] { return Port_Interrupt::Requested() == 0 && !std::ferror(stdout); };
   for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
@@ -137,18 +189,21 @@ int resolve(settings& set, const console& shown) {
     }
     char source[LA_MAX_PATH];
     char netlist[LA_MAX_PATH];
+    const int runs_before = launcher.runs;
     short result = launcher.find(name.c_str(), source, netlist, set.top);
+    const bool is_built = launcher.runs > runs_before;
     if (result == LA_FOUND && !launcher.saw_netlist() && !is_dry_run() &&
-        !Port::File::exist(netlist)) {
-      complain(std::string("no netlister has written ") + netlist);
+        !is_written(source, netlist)) {
       result = LA_FAILED;
       source[0] = '\0';
       netlist[0] = '\0';
     }
     print_result(set, name, result, source, netlist);
     if (result == LA_NOT_FOUND) complain("not found: " + name);
+    counted.add(result, is_built);
     status = worse(status, result);
   }
+  counted.tell(set.names.size());
   if (set.json) print_totals(launcher.ok, launcher.errors, launcher.warnings);
   return status;
 }

@@ -123,6 +123,10 @@ bool File::setoldest(const char* path) {
   return ::utimensat(AT_FDCWD, path, times, 0) == 0;
 }
 
+bool File::remove(const char* path) {
+  return ::unlink(path) == 0;
+}
+
 bool File::chdir(const char* path) {
   return ::chdir(path) == 0;
 }

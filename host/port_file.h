@@ -90,6 +90,8 @@ class File {
   /// Sets the modification time of path to the oldest that its file system knows. Returns false
   /// when that fails.
   static bool setoldest(const char* path);
+  /// Removes a file. Returns false when that fails.
+  static bool remove(const char* path);
   /// Changes the current directory of the process. Returns false when that fails.
   static bool chdir(const char* path);
   /// Writes the current directory into buffer, which holds size characters; the empty string when

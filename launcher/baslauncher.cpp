@@ -210,6 +210,14 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
   return false;
 }
 
+/// Whether the host has asked for an end; if so, says what is not done.
+bool LA_LAUNCHER::is_interrupted(const LA_FULLFILE& file) {
+  if (Port_Interrupt::Requested() == 0) return false;
+  message().issueError("Launcher: The work on %s was interrupted.\n", file.get_tail());
+  ++errors;
+  return true;
+}
+
 /// Looks for the very file that the user named with an extension.
 void LA_LAUNCHER::find_named(lookup& where) {
   named_found = 0;
@@ -337,6 +345,7 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
   std::vector<bool> failed(index->num_spellings());
 
   while (path.back().tried < path.back().producers->size() || path.size() > 1) {
+    if (is_interrupted(where.given)) return LA_FAILED;
     if (path.back().tried == path.back().producers->size()) {
       // No rule produces the input of the rule one level up: perhaps it is there.
       path.pop_back();
@@ -490,6 +499,7 @@ short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CO
       source.file,  nullptr, nullptr, nullptr, force ? LA_BUILD_FORCED : LA_BUILD_UNDECIDED,
       source.status};
   for (const LA_RULE* rule : chain) {
+    if (is_interrupted(source.file)) return LA_FAILED;
     step.rule_before = std::exchange(step.rule, rule);
     if (detail) message().issueStatus("Launcher: Using rule %s\n", rule->rule_name.get());
     step.output = outputs.with_ext(rule->target->get_ext());
@@ -595,8 +605,12 @@ void LA_LAUNCHER::decide(build_step& step) const {
 /// Adds the step to the explanation.
 void LA_LAUNCHER::note(const build_step& step) const {
   if (explanation == nullptr) return;
+  // After a run, what was known of the files is no longer true.
+  const bool is_known = step.decision != LA_BUILD_AFTER_REBUILD;
+  const Port::FileStatus unknown;
   explanation->steps.push_back({step.rule, input_of(step).get_fullfile(), step.output,
-                                step.input_status, step.output_status, step.dependency,
+                                is_known ? step.input_status : unknown,
+                                is_known ? step.output_status : unknown, step.dependency,
                                 step.dependency_status, step.decision, ""});
 }
 
@@ -648,6 +662,7 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
   std::string command;
   if (!make_command(*step.rule, input, output, options, top, command)) return false;
   message().issueStatus("Launcher: Executing %s\n", command.c_str());
+  ++runs;
   if (explanation != nullptr) explanation->steps.back().command = command;
   if (Port_Env::GetEnv("LA_TEST") != nullptr) return true;
   const Port::FileStatus before = status_of(step.output);
@@ -661,17 +676,19 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
 void LA_LAUNCHER::distrust(const char* output, const Port::FileStatus& before) {
   const Port::FileStatus after = status_of(output);
   if (!after.exists || (before.exists && after.time == before.time)) return;
-  if (!Port::File::setoldest(output)) {
-    message().issueWarning(
-        "Launcher: %s comes from a failed run, and its time stamp could not be set back: remove "
-        "it\n",
-        tail_of(output));
-    ++warnings;
-  } else if (detail) {
+  if (Port::File::setoldest(output)) {
+    if (!detail) return;
     message().issueStatus(
         "Launcher: %s comes from a failed run, its time stamp is set back: it will be made again\n",
         tail_of(output));
+    return;
   }
+  // The time stamp of another user's file cannot be set.
+  const bool is_removed = Port::File::remove(output);
+  message().issueWarning(
+      "Launcher: %s comes from a failed run, and its time stamp could not be set back: %s\n",
+      tail_of(output), is_removed ? "it is removed" : "remove it");
+  ++warnings;
 }
 
 /// Goes to the directory that the rule asks for. Where it cannot be entered, the netlister runs

@@ -95,6 +95,8 @@ class LA_LAUNCHER {
   /// What find has reported since construction. Findings on the rules do not count here.
   int errors = 0;
   int warnings = 0;
+  /// How many netlisters find has announced since construction.
+  int runs = 0;
 
  private:
   short find_disabled(const char* name, char* netlist_path);
@@ -106,6 +108,7 @@ class LA_LAUNCHER {
     Port::FileStatus status;
   };
   struct lookup;
+  bool is_interrupted(const LA_FULLFILE& file);
   void find_named(lookup& where);
   short find_native(lookup& where, bool named_kbc, found_file& source, char* netlist_path);
   Port::FileStatus status_at_home(const char* path) const;
