@@ -171,7 +171,7 @@ bool is_written(const char* source, const char* netlist) {
     complain(is_directory ? std::string(netlist) + " is a directory"
                           : std::string("no netlister has written ") + netlist);
   } else if (status.time < Port::File::status(source).time) {
-    complain(std::string(netlist) + " is older than its source: has its netlister written it?");
+    complain(std::string(netlist) + " is older than its source: the next call makes it again");
   }
   return status.exists;
 }
