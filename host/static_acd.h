@@ -26,32 +26,29 @@ class StaticAcdRead {
 
   /// The value of key, split at separator, field number index (from 0); when separator2 is not
   /// null, that field split at separator2, part number index2. An empty string when the key, the
-  /// field or the part does not exist. Fields asked for in their order cost the length of the
-  /// value once, not once for each.
+  /// field or the part does not exist.
   Port::StringBase<char> GetStringByKey(const char* key, const char* separator, short index,
                                         const char* separator2, short index2) const;
 
+  /// The same without copies, for who wants all of the fields: the value of key, empty when it does
+  /// not exist, and the pieces of such a text. They are good as long as this object.
+  std::string_view value(std::string_view key) const;
+  static void split(std::string_view text, std::string_view separator,
+                    std::vector<std::string_view>& pieces);
   /// All keys, in the order of the file; good as long as this object.
   const std::vector<std::string_view>& keys() const { return keys_; }
   /// False when something of the file could not be read or understood.
   bool valid() const { return valid_; }
 
  private:
-  /// A value, and where the field of it that was asked for last begins.
-  struct record {
-    std::string value;
-    std::string separator;
-    int index = 0;
-    std::size_t start = 0;
-  };
-
   void read_line(const char* path, int number, std::string_view line);
-  std::string_view field(const char* key, std::string_view separator, int index) const;
+  std::string_view joined(std::string_view value, std::string_view content);
 
-  mutable std::unordered_map<std::string, record> records_;
+  std::string text_;  ///< the file, with the lines of a value joined where the first stands
+  std::unordered_map<std::string_view, std::string_view> values_;
   std::vector<std::string_view> keys_;
-  std::string* last_value_ = nullptr;
-  std::string passed_over_;  ///< the value of a key that stands earlier too
+  std::string_view* last_value_ = nullptr;
+  std::string_view passed_over_;  ///< the value of a key that stands earlier too
   bool valid_ = true;
 };
 

@@ -3,6 +3,7 @@
 #include <climits>
 #include <exception>
 #include <string>
+#include <string_view>
 #include <unordered_map>
 #include <vector>
 
@@ -422,9 +423,9 @@ constexpr rule_field FIELDS[] = {
     {"CheckerWarningStatus", store_checker_status<LA_WARNING>, 727},
     {"CheckerFatalStatus", store_checker_status<LA_FATAL>, 739},
 };
-constexpr short DEPENDENCY_FILES = 2;
-constexpr short LAST_NETLISTER_STATUS = 11;
-constexpr short NUM_FIELDS = std::size(FIELDS);
+constexpr std::size_t DEPENDENCY_FILES = 2;
+constexpr std::size_t LAST_NETLISTER_STATUS = 11;
+constexpr std::size_t NUM_FIELDS = std::size(FIELDS);
 
 }  // namespace
 
@@ -596,9 +597,10 @@ class system_rules_loader {
 
   /// Reads all rules. Returns whether there was no error.
   bool read() {
-    for (int i = 0;; ++i) {
-      const Port::StringBase<char> name = field("RULES", static_cast<short>(i));
-      if (name.empty()) break;
+    std::vector<std::string_view> names;
+    StaticAcdRead::split(reader_.value("RULES"), ",", names);
+    for (std::size_t i = 0; i < names.size() && !names[i].empty(); ++i) {
+      const std::string name(names[i]);
       if (i == SHRT_MAX) {
         message().issueError("Launcher: Rule: %s - There are more than %d rules.\n", name.c_str(),
                              SHRT_MAX);
@@ -613,14 +615,15 @@ class system_rules_loader {
   void move_to(DARRAY_LA_RULE_PTR& set) { batch_.move_to(set); }
 
  private:
-  Port::StringBase<char> field(const char* key, short index) const {
-    return reader_.GetStringByKey(key, ",", index, nullptr, 0);
+  std::string_view field(std::size_t position) const {
+    return position < fields_.size() ? fields_[position] : std::string_view();
   }
 
   void read_rule(const char* name) {
     auto rule = std::make_unique<LA_RULE>(name);
     if (UT_STR::Len(name) >= LA_MAX_PATH) refuse_length(name, "The name");
-    for (short position = 0; position < NUM_FIELDS; ++position) {
+    StaticAcdRead::split(reader_.value(name), ",", fields_);
+    for (std::size_t position = 0; position < NUM_FIELDS; ++position) {
       read_field(*rule, position);
       if (position == LAST_NETLISTER_STATUS && rule->netlister_status.count == 0) {
         report(703, name,
@@ -633,46 +636,57 @@ class system_rules_loader {
              "There myst be at least one of the following: CheckerSuccessStatus, "
              "CheckerWarningStatus, or CheckerFatalStatus.");
     }
-    if (!field(name, NUM_FIELDS).empty()) {
+    if (!field(NUM_FIELDS).empty()) {
       message().issueWarning("Launcher: Rule: %s - Only the first %d fields are used.\n", name,
-                             NUM_FIELDS);
+                             static_cast<int>(NUM_FIELDS));
     }
     batch_.add(std::move(rule));
   }
 
-  void read_field(LA_RULE& rule, short position) {
+  void read_field(LA_RULE& rule, std::size_t position) {
     const rule_field& known = FIELDS[position];
     const char* name = rule.rule_name;
-    const Port::StringBase<char> text = field(name, position);
-    if (text.empty() || text.Compare("NONE", Port::StringBase<char>::IGNORE_CASE) == 0) {
+    const std::string_view given = field(position);
+    char text[LA_MAX_PATH];
+    if (given.empty() || (given.size() == 4 && UT_STR::INCompare(given.data(), "NONE", 4) == 0)) {
       if (known.required) report(known.line, name, std::string(known.keyword) + " is required.");
     } else if (position == DEPENDENCY_FILES) {
       read_dependency_files(rule);
-    } else if (text.length() >= LA_MAX_PATH) {
+    } else if (!fits(given, text)) {
       refuse_length(name, known.keyword);
-    } else if (!known.store(rule, text.c_str())) {
+    } else if (!known.store(rule, text)) {
       report(known.line, name, std::string("Invalid exit code for ") + known.keyword + ".");
     }
   }
 
   void read_dependency_files(LA_RULE& rule) {
-    for (int i = 0; i <= SHRT_MAX; ++i) {
-      const Port::StringBase<char> part =
-          reader_.GetStringByKey(rule.rule_name, ",", DEPENDENCY_FILES, "|", static_cast<short>(i));
-      if (part.empty()) return;
-      if (part.length() >= LA_MAX_PATH) {
+    std::vector<std::string_view> parts;
+    StaticAcdRead::split(field(DEPENDENCY_FILES), "|", parts);
+    for (std::size_t i = 0; i < parts.size() && !parts[i].empty(); ++i) {
+      char text[LA_MAX_PATH];
+      if (i > SHRT_MAX) {
+        report(__LINE__, rule.rule_name, "There are too many dependency files.");
+        return;
+      }
+      if (!fits(parts[i], text)) {
         refuse_length(rule.rule_name, "Dependency file");
         continue;
       }
-      const LA_FILE file(part.c_str());
+      const LA_FILE file(text);
       if (file.get_tail() == nullptr || file.get_head() != nullptr) {
         message().issueWarning(
             "Launcher: Rule: %s - Dependency file %s is not a plain file name.\n",
-            rule.rule_name.get(), part.c_str());
+            rule.rule_name.get(), text);
       }
-      rule.add_dependency_file(part.c_str());
+      rule.add_dependency_file(text);
     }
-    report(__LINE__, rule.rule_name, "There are too many dependency files.");
+  }
+
+  /// Copies text into a buffer, with a terminator. False when it does not fit.
+  static bool fits(std::string_view text, char (&buffer)[LA_MAX_PATH]) {
+    if (text.size() >= sizeof buffer) return false;
+    buffer[text.copy(buffer, text.size())] = '\0';
+    return true;
   }
 
   void refuse_length(const char* rule_name, const char* what, int line = __builtin_LINE()) {
@@ -687,6 +701,7 @@ class system_rules_loader {
   }
 
   StaticAcdRead reader_;
+  std::vector<std::string_view> fields_;  ///< of the current rule
   bool good_ = true;
   rule_batch batch_;
 };
