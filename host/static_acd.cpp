@@ -32,18 +32,10 @@ std::string_view without_comment(std::string_view line) {
   return line;
 }
 
-/// Takes the first piece from the front of text; text is then null when it was the last.
-std::string_view take_piece(std::string_view& text, std::string_view separator) {
-  const std::size_t end = text.find(separator);
-  const std::string_view piece = trimmed(text.substr(0, end));
-  text = end == text.npos ? std::string_view() : text.substr(end + separator.size());
-  return piece;
-}
-
 /// A piece of text by its number; empty when there are fewer.
 std::string_view piece_at(std::string_view text, std::string_view separator, int index) {
-  for (; index > 0 && text.data() != nullptr; --index) take_piece(text, separator);
-  return take_piece(text, separator);
+  for (; index > 0 && text.data() != nullptr; --index) StaticAcdRead::take_piece(text, separator);
+  return StaticAcdRead::take_piece(text, separator);
 }
 
 }  // namespace
@@ -90,9 +82,13 @@ void StaticAcdRead::read_line(const char* path, int number, std::string_view lin
     *last_value_ = joined(*last_value_, content);
     return;
   }
-  const auto [place, is_new] = values_.try_emplace(key);
-  if (is_new) keys_.push_back(key);
-  last_value_ = is_new ? &place->second : &passed_over_;
+  int& known = index_.place(la_hash(key), is_key(key));
+  last_value_ = &passed_over_;
+  if (known == la_hash_index::NONE) {
+    known = static_cast<int>(keys_.size());
+    keys_.push_back(key);
+    last_value_ = &values_.emplace_back();
+  }
   *last_value_ = trimmed(line.substr(equals + 1));
 }
 
@@ -106,16 +102,16 @@ std::string_view StaticAcdRead::joined(std::string_view value, std::string_view 
 }
 
 std::string_view StaticAcdRead::value(std::string_view key) const {
-  const auto found = values_.find(key);
-  return found != values_.end() ? found->second : std::string_view();
+  const int number = index_.find(la_hash(key), is_key(key));
+  return number != la_hash_index::NONE ? values_[static_cast<std::size_t>(number)]
+                                       : std::string_view();
 }
 
-void StaticAcdRead::split(std::string_view text, std::string_view separator,
-                          std::vector<std::string_view>& pieces) {
-  pieces.clear();
-  do {
-    pieces.push_back(take_piece(text, separator));
-  } while (text.data() != nullptr);
+std::string_view StaticAcdRead::take_piece(std::string_view& text, std::string_view separator) {
+  const std::size_t end = text.find(separator);
+  const std::string_view piece = trimmed(text.substr(0, end));
+  text = end == text.npos ? std::string_view() : text.substr(end + separator.size());
+  return piece;
 }
 
 Port::StringBase<char> StaticAcdRead::GetStringByKey(const char* key, const char* separator,

@@ -5,9 +5,9 @@
 #include <cstddef>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
+#include "host/hash_index.h"
 #include "host/port_string.h"
 
 /// Reads one static data file. A line that begins with a blank continues the value above it, with
@@ -30,11 +30,11 @@ class StaticAcdRead {
   Port::StringBase<char> GetStringByKey(const char* key, const char* separator, short index,
                                         const char* separator2, short index2) const;
 
-  /// The same without copies, for who wants all of the fields: the value of key, empty when it does
-  /// not exist, and the pieces of such a text. They are good as long as this object.
+  /// The same without copies, for who wants all of the fields: the value of key, null when it does
+  /// not exist, which is good as long as this object.
   std::string_view value(std::string_view key) const;
-  static void split(std::string_view text, std::string_view separator,
-                    std::vector<std::string_view>& pieces);
+  /// Takes the first field from the front of such a text, which is null after the last one.
+  static std::string_view take_piece(std::string_view& text, std::string_view separator);
   /// All keys, in the order of the file; good as long as this object.
   const std::vector<std::string_view>& keys() const { return keys_; }
   /// False when something of the file could not be read or understood.
@@ -42,11 +42,15 @@ class StaticAcdRead {
 
  private:
   void read_line(const char* path, int number, std::string_view line);
+  auto is_key(std::string_view key) const {
+    return [this, key](int number) { return keys_[static_cast<std::size_t>(number)] == key; };
+  }
   std::string_view joined(std::string_view value, std::string_view content);
 
   std::string text_;  ///< the file, with the lines of a value joined where the first stands
-  std::unordered_map<std::string_view, std::string_view> values_;
   std::vector<std::string_view> keys_;
+  std::vector<std::string_view> values_;  ///< of the same numbers
+  la_hash_index index_;                   ///< of those numbers, by key
   std::string_view* last_value_ = nullptr;
   std::string_view passed_over_;  ///< the value of a key that stands earlier too
   bool valid_ = true;

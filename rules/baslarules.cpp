@@ -4,9 +4,9 @@
 #include <exception>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
+#include "host/hash_index.h"
 #include "host/pm_devkey.h"
 #include "host/pm_pic.h"
 #include "host/port_env.h"
@@ -42,7 +42,8 @@ bool is_none(const char* text) {
 
 namespace {
 
-/// Operators by their number: what a status value begins with, and what a dump prints.
+/// Operators by their number: what a status value begins with, one character, and what a dump
+/// prints.
 constexpr const char* SYMBOLS[] = {"=", "!", "<", ">", "", "NONE"};
 constexpr unsigned short WRITTEN_OPERATORS = OP_GT + 1;
 
@@ -81,10 +82,9 @@ bool parse_status(const char* text, unsigned short& op, int& code) {
   op = OP_EQ;
   const char* digits = value;
   for (unsigned short i = 0; i < WRITTEN_OPERATORS; ++i) {
-    const std::size_t length = UT_STR::Len(SYMBOLS[i]);
-    if (UT_STR::NCompare(value, SYMBOLS[i], length) != 0) continue;
+    if (*digits != SYMBOLS[i][0]) continue;
     op = i;
-    digits += length;
+    ++digits;
     while (*digits == ' ') ++digits;
     break;
   }
@@ -270,8 +270,8 @@ void fill_for_check(LA_KEYWORD_TABLE& table) {
 }
 
 bool names_a_file(const std::unique_ptr<LA_FILE>& file) {
-  return file && (file->get_name() != nullptr || file->get_ext() != nullptr) &&
-         !file->match_tail("NONE");
+  if (!file) return false;
+  return file->get_ext() != nullptr || (file->get_name() != nullptr && !is_none(file->get_name()));
 }
 
 bool check_template(const LA_RULE& rule, const char* keyword, const char* text,
@@ -308,20 +308,30 @@ bool check_rule(const LA_RULE& rule, const LA_KEYWORD_TABLE& table) {
   return good;
 }
 
+bool is_same(const char* a, const char* b) {
+  return a == nullptr || b == nullptr ? a == b : UT_STR::ICompare(a, b) == 0;
+}
+
+bool redefines(const LA_RULE& a, const LA_RULE& b) {
+  return is_same(a.netlist_file->get_name(), b.netlist_file->get_name()) &&
+         is_same(a.netlist_file->get_ext(), b.netlist_file->get_ext()) &&
+         is_same(a.target->get_ext(), b.target->get_ext());
+}
+
 /// Reports every pair of rules for the same netlist file and target, the earlier rule first.
 bool check_redefinitions(const DARRAY_LA_RULE_PTR& batch) {
   // For each rule, the next one for the same conversion.
   std::vector<int> next(static_cast<std::size_t>(batch.count), batch.count);
-  std::unordered_map<std::string, int> last;
+  la_hash_index last;
   for (int i = 0; i < batch.count; ++i) {
     const LA_RULE& rule = *batch.elements[i];
     // A target without extension matches none.
     if (rule.target->get_ext() == nullptr) continue;
-    const auto [same, is_first] =
-        last.try_emplace(key_of(rule.netlist_file->get_tail(), rule.target->get_ext()), i);
-    if (is_first) continue;
-    next[static_cast<std::size_t>(same->second)] = i;
-    same->second = i;
+    const char* name = rule.netlist_file->get_name();
+    int& same = last.place(la_hash(name != nullptr ? name : "", hash_of_extensions(rule)),
+                           [&](int other) { return redefines(rule, *batch.elements[other]); });
+    if (same != la_hash_index::NONE) next[static_cast<std::size_t>(same)] = i;
+    same = i;
   }
   bool good = true;
   for (int a = 0; a < batch.count; ++a) {
@@ -597,10 +607,10 @@ class system_rules_loader {
 
   /// Reads all rules. Returns whether there was no error.
   bool read() {
-    std::vector<std::string_view> names;
-    StaticAcdRead::split(reader_.value("RULES"), ",", names);
-    for (std::size_t i = 0; i < names.size() && !names[i].empty(); ++i) {
-      const std::string name(names[i]);
+    std::string_view names = reader_.value("RULES");
+    for (int i = 0;; ++i) {
+      const std::string name(StaticAcdRead::take_piece(names, ","));
+      if (name.empty()) break;
       if (i == SHRT_MAX) {
         message().issueError("Launcher: Rule: %s - There are more than %d rules.\n", name.c_str(),
                              SHRT_MAX);
@@ -615,16 +625,12 @@ class system_rules_loader {
   void move_to(DARRAY_LA_RULE_PTR& set) { batch_.move_to(set); }
 
  private:
-  std::string_view field(std::size_t position) const {
-    return position < fields_.size() ? fields_[position] : std::string_view();
-  }
-
   void read_rule(const char* name) {
     auto rule = std::make_unique<LA_RULE>(name);
     if (UT_STR::Len(name) >= LA_MAX_PATH) refuse_length(name, "The name");
-    StaticAcdRead::split(reader_.value(name), ",", fields_);
+    std::string_view record = reader_.value(name);
     for (std::size_t position = 0; position < NUM_FIELDS; ++position) {
-      read_field(*rule, position);
+      read_field(*rule, position, StaticAcdRead::take_piece(record, ","));
       if (position == LAST_NETLISTER_STATUS && rule->netlister_status.count == 0) {
         report(703, name,
                "There must be at least one of the following: NetlisterSuccessStatus, "
@@ -636,22 +642,21 @@ class system_rules_loader {
              "There myst be at least one of the following: CheckerSuccessStatus, "
              "CheckerWarningStatus, or CheckerFatalStatus.");
     }
-    if (!field(NUM_FIELDS).empty()) {
+    if (!StaticAcdRead::take_piece(record, ",").empty()) {
       message().issueWarning("Launcher: Rule: %s - Only the first %d fields are used.\n", name,
                              static_cast<int>(NUM_FIELDS));
     }
     batch_.add(std::move(rule));
   }
 
-  void read_field(LA_RULE& rule, std::size_t position) {
+  void read_field(LA_RULE& rule, std::size_t position, std::string_view given) {
     const rule_field& known = FIELDS[position];
     const char* name = rule.rule_name;
-    const std::string_view given = field(position);
     char text[LA_MAX_PATH];
     if (given.empty() || (given.size() == 4 && UT_STR::INCompare(given.data(), "NONE", 4) == 0)) {
       if (known.required) report(known.line, name, std::string(known.keyword) + " is required.");
     } else if (position == DEPENDENCY_FILES) {
-      read_dependency_files(rule);
+      read_dependency_files(rule, given);
     } else if (!fits(given, text)) {
       refuse_length(name, known.keyword);
     } else if (!known.store(rule, text)) {
@@ -659,16 +664,12 @@ class system_rules_loader {
     }
   }
 
-  void read_dependency_files(LA_RULE& rule) {
-    std::vector<std::string_view> parts;
-    StaticAcdRead::split(field(DEPENDENCY_FILES), "|", parts);
-    for (std::size_t i = 0; i < parts.size() && !parts[i].empty(); ++i) {
-      char text[LA_MAX_PATH];
-      if (i > SHRT_MAX) {
-        report(__LINE__, rule.rule_name, "There are too many dependency files.");
-        return;
-      }
-      if (!fits(parts[i], text)) {
+  void read_dependency_files(LA_RULE& rule, std::string_view files) {
+    char text[LA_MAX_PATH];
+    for (int i = 0; i <= SHRT_MAX; ++i) {
+      const std::string_view part = StaticAcdRead::take_piece(files, "|");
+      if (part.empty()) return;
+      if (!fits(part, text)) {
         refuse_length(rule.rule_name, "Dependency file");
         continue;
       }
@@ -680,6 +681,7 @@ class system_rules_loader {
       }
       rule.add_dependency_file(text);
     }
+    report(__LINE__, rule.rule_name, "There are too many dependency files.");
   }
 
   /// Copies text into a buffer, with a terminator. False when it does not fit.
@@ -701,7 +703,6 @@ class system_rules_loader {
   }
 
   StaticAcdRead reader_;
-  std::vector<std::string_view> fields_;  ///< of the current rule
   bool good_ = true;
   rule_batch batch_;
 };

@@ -1,7 +1,8 @@
 #include "rules/inheritance.h"
 
 #include <algorithm>
-#include <unordered_map>
+
+#include "host/hash_index.h"
 
 namespace {
 
@@ -49,27 +50,28 @@ void clear_none(LA_RULE& rule) {
 
 }  // namespace
 
-std::string key_of(const char* first, const char* second) {
-  std::string key(first != nullptr ? first : "");
-  key += '/';
-  key += second != nullptr ? second : "";
-  UT_STR::Lower(key.data());
-  return key;
+std::uint32_t hash_of_extensions(const LA_RULE& rule) {
+  const char* from = rule.netlist_file->get_ext();
+  const char* to = rule.target->get_ext();
+  return la_hash(to != nullptr ? to : "", la_hash(from != nullptr ? from : ""));
 }
 
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
   // From the last rule to the first: the next one for the same extensions is already complete, and
   // so has whatever any of the later ones could give. "NONE" keeps that out until all is taken.
-  std::unordered_map<std::string, const LA_RULE*> next;
+  la_hash_index next;
   for (int i = rules.count - 1; i >= 0; --i) {
     LA_RULE& rule = *rules.elements[i];
     const char* from = rule.netlist_file->get_ext();
     const char* to = rule.target->get_ext();
     // A missing extension matches none.
     if (from == nullptr || to == nullptr) continue;
-    const LA_RULE*& later = next[key_of(from, to)];
-    if (later != nullptr) complete(rule, *later);
-    later = &rule;
+    int& later = next.place(hash_of_extensions(rule), [&](int other) {
+      return rules.elements[other]->netlist_file->match_ext(from) &&
+             rules.elements[other]->target->match_ext(to);
+    });
+    if (later != la_hash_index::NONE) complete(rule, *rules.elements[later]);
+    later = i;
   }
   for (LA_RULE* rule : rules) clear_none(*rule);
 }
