@@ -57,8 +57,11 @@ int UT_STR::NCompare(const char* a, const char* b, std::size_t n) {
 
 int UT_STR::INCompare(const char* a, const char* b, std::size_t n) {
   for (std::size_t i = 0; i < n; ++i) {
-    const int difference = lower(a[i]) - lower(b[i]);
-    if (difference != 0 || a[i] == '\0') return difference;
+    if (a[i] != b[i]) {
+      const int difference = lower(a[i]) - lower(b[i]);
+      if (difference != 0) return difference;
+    }
+    if (a[i] == '\0') return 0;
   }
   return 0;
 }
@@ -85,25 +88,6 @@ void UT_STR::Trim(char* s) {
 
 unsigned char UT_STR::AllBlank(const char* s) {
   return *skip_blanks(s) == '\0';
-}
-
-char UT_STR::GetToken(char* line, char* token, const char* delimiters) {
-  const bool blanks_end = std::strchr(delimiters, ' ') != nullptr;
-  const char* start = skip_blanks(line);
-  const char* end = start + std::strcspn(start, delimiters);
-  if (blanks_end) {
-    const char* tab =
-        static_cast<const char*>(std::memchr(start, '\t', static_cast<std::size_t>(end - start)));
-    if (tab != nullptr) end = tab;
-  }
-  const auto length = static_cast<std::size_t>(end - start);
-  std::memcpy(token, start, length);
-  token[length] = '\0';
-
-  const char delimiter = *end == '\t' ? ' ' : *end;
-  const char* rest = *end == '\0' ? end : end + 1;
-  std::memmove(line, rest, Len(rest) + 1);
-  return delimiter;
 }
 
 unsigned char UT_STR::StrToL(const char* s, long& value) {

@@ -36,6 +36,10 @@ bool is_none(const char* text) {
   return UT_STR::ICompare(text, "NONE") == 0;
 }
 
+bool is_same(std::string_view a, std::string_view b) {
+  return a.size() == b.size() && UT_STR::INCompare(a.data(), b.data(), a.size()) == 0;
+}
+
 }  // namespace
 
 // ---- Exit-status entries ----
@@ -308,14 +312,13 @@ bool check_rule(const LA_RULE& rule, const LA_KEYWORD_TABLE& table) {
   return good;
 }
 
-bool is_same(const char* a, const char* b) {
-  return a == nullptr || b == nullptr ? a == b : UT_STR::ICompare(a, b) == 0;
-}
-
 bool redefines(const LA_RULE& a, const LA_RULE& b) {
-  return is_same(a.netlist_file->get_name(), b.netlist_file->get_name()) &&
-         is_same(a.netlist_file->get_ext(), b.netlist_file->get_ext()) &&
-         is_same(a.target->get_ext(), b.target->get_ext());
+  const auto match = [](const char* text, const char* other) {
+    return text == nullptr || other == nullptr ? text == other : UT_STR::ICompare(text, other) == 0;
+  };
+  return match(a.netlist_file->get_name(), b.netlist_file->get_name()) &&
+         match(a.netlist_file->get_ext(), b.netlist_file->get_ext()) &&
+         match(a.target->get_ext(), b.target->get_ext());
 }
 
 /// Reports every pair of rules for the same netlist file and target, the earlier rule first.
@@ -386,7 +389,7 @@ struct rule_batch {
 /// One field of a rule, as both kinds of rules file write it. The order is that of the fields of a
 /// record of system rules.
 struct rule_field {
-  const char* keyword;
+  std::string_view keyword;
   /// Stores text in the rule. False when it is not a valid status value.
   bool (*store)(LA_RULE& rule, const char* text);
   /// The line that the finding of the system rules loader on this field is known by: that a
@@ -394,7 +397,7 @@ struct rule_field {
   int line = 0;
   bool required = false;
   /// The keyword in the message on a status value of a user rules file, where it differs.
-  const char* name_in_message = keyword;
+  const char* name_in_message = keyword.data();
 };
 
 /// Makes a field's store function of a setter that cannot fail.
@@ -442,7 +445,7 @@ constexpr std::size_t NUM_FIELDS = std::size(FIELDS);
 std::vector<const char*> rule_keywords() {
   std::vector<const char*> keywords = {"RuleName"};
   for (const rule_field& field : FIELDS) {
-    if (field.store != nullptr) keywords.push_back(field.keyword);
+    if (field.store != nullptr) keywords.push_back(field.keyword.data());
   }
   return keywords;
 }
@@ -508,19 +511,19 @@ class user_rules_loader {
   }
 
  private:
-  void take_statement(const char* keyword, const char* value) {
-    if (UT_STR::ICompare(keyword, "RuleName") == 0) {
+  void take_statement(std::string_view keyword, const char* value) {
+    if (is_same(keyword, "RuleName")) {
       finish_rule();
       rule_ = std::make_unique<LA_RULE>(value);
       return;
     }
     if (!rule_) return report("%s", "Rule does not have a RuleName");
     for (const rule_field& field : FIELDS) {
-      if (field.store == nullptr || UT_STR::ICompare(keyword, field.keyword) != 0) continue;
+      if (field.store == nullptr || !is_same(keyword, field.keyword)) continue;
       if (!field.store(*rule_, value)) report("Invalid exit code for %s.", field.name_in_message);
       return;
     }
-    report("Unexpected key word %s", keyword);
+    report("Unexpected key word %s", keyword.data());
   }
 
   void finish_rule() {
@@ -653,14 +656,14 @@ class system_rules_loader {
     const rule_field& known = FIELDS[position];
     const char* name = rule.rule_name;
     char text[LA_MAX_PATH];
-    if (given.empty() || (given.size() == 4 && UT_STR::INCompare(given.data(), "NONE", 4) == 0)) {
+    if (given.empty() || is_same(given, "NONE")) {
       if (known.required) report(known.line, name, std::string(known.keyword) + " is required.");
     } else if (position == DEPENDENCY_FILES) {
       read_dependency_files(rule, given);
     } else if (!fits(given, text)) {
-      refuse_length(name, known.keyword);
+      refuse_length(name, known.keyword.data());
     } else if (!known.store(rule, text)) {
-      report(known.line, name, std::string("Invalid exit code for ") + known.keyword + ".");
+      report(known.line, name, "Invalid exit code for " + std::string(known.keyword) + ".");
     }
   }
 
