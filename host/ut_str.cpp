@@ -107,3 +107,18 @@ void UT_STR::Lower(char* s) {
 int UT_STR::IsAlpha(int c) {
   return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
 }
+
+la_text::la_text(const char* chars) {
+  if (chars == nullptr) {
+    room_[LAST] = ABSENT;
+    return;
+  }
+  const std::size_t size = UT_STR::Len(chars) + 1;
+  room_[LAST] = size <= SIZE ? IN_PLACE : ELSEWHERE;
+  if (size <= SIZE) {
+    std::memcpy(room_, chars, size);
+  } else {
+    const char* copy = UT_STR::Dup(chars);
+    std::memcpy(room_, &copy, sizeof copy);
+  }
+}
