@@ -57,21 +57,22 @@ std::uint32_t hash_of_extensions(const LA_RULE& rule) {
 }
 
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
-  // From the last rule to the first: the next one for the same extensions is already complete, and
-  // so has whatever any of the later ones could give. "NONE" keeps that out until all is taken.
+  // From the last rule to the first: the next one for the same extensions is complete by then. What
+  // it lacks has no later one either, or it is kept out.
   la_hash_index next;
   for (int i = rules.count - 1; i >= 0; --i) {
     LA_RULE& rule = *rules.elements[i];
     const char* from = rule.netlist_file->get_ext();
     const char* to = rule.target->get_ext();
     // A missing extension matches none.
-    if (from == nullptr || to == nullptr) continue;
-    int& later = next.place(hash_of_extensions(rule), [&](int other) {
-      return rules.elements[other]->netlist_file->match_ext(from) &&
-             rules.elements[other]->target->match_ext(to);
-    });
-    if (later != la_hash_index::NONE) complete(rule, *rules.elements[later]);
-    later = i;
+    if (from != nullptr && to != nullptr) {
+      int& later = next.place(hash_of_extensions(rule), [&](int other) {
+        return rules.elements[other]->netlist_file->match_ext(from) &&
+               rules.elements[other]->target->match_ext(to);
+      });
+      if (later != la_hash_index::NONE) complete(rule, *rules.elements[later]);
+      later = i;
+    }
+    clear_none(rule);
   }
-  for (LA_RULE* rule : rules) clear_none(*rule);
 }
