@@ -46,39 +46,31 @@ void Stream::fill() {
   end_ = next_ + std::max<ssize_t>(length, 0);
 }
 
-/// Hands the pieces of the next line to append. Returns whether a line end followed.
-template <class Append>
-bool Stream::read_pieces(Append append) {
-  bool ended = false;
-  while (!ended && next_ != end_) {
-    const char* stop = std::find(next_, end_, '\n');
-    ended = stop != end_;
-    append(next_, static_cast<int>(stop - next_));
-    next_ = ended ? stop + 1 : stop;
-    if (next_ == end_) fill();
-  }
-  return ended;
-}
-
 int Stream::readline(char* buffer, int size) {
   int length = 0;
   char last = '\0';
-  const bool ended = read_pieces([&](const char* piece, int piece_length) {
-    if (length < size) std::copy_n(piece, std::min(piece_length, size - length), buffer + length);
-    if (piece_length > 0) last = piece[piece_length - 1];
-    length = std::min(length, INT_MAX - BLOCK) + piece_length;
-  });
+  bool ended = false;
+  while (!ended && next_ != end_) {
+    const auto left = static_cast<std::size_t>(end_ - next_);
+    const auto* stop = static_cast<const char*>(std::memchr(next_, '\n', left));
+    ended = stop != nullptr;
+    if (!ended) stop = end_;
+    const auto piece = static_cast<int>(stop - next_);
+    if (length < size) std::copy_n(next_, std::min(piece, size - length), buffer + length);
+    if (piece > 0) last = stop[-1];
+    length = std::min(length, INT_MAX - BLOCK) + piece;
+    next_ = ended ? stop + 1 : stop;
+    if (next_ == end_) fill();
+  }
   if (ended && last == '\r') --length;
   buffer[std::min(length, size - 1)] = '\0';
   return length;
 }
 
-void Stream::readline(std::string& line) {
-  line.clear();
-  const bool ended = read_pieces([&line](const char* piece, int length) {
-    line.append(piece, static_cast<std::size_t>(length));
-  });
-  if (ended && line.ends_with('\r')) line.pop_back();
+std::string Stream::readall() {
+  std::string text;
+  for (; !geteof(); fill()) text.append(next_, end_);
+  return text;
 }
 
 Place::Place() : descriptor_(::open(".", O_PATH | O_DIRECTORY | O_CLOEXEC)) {}

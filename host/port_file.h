@@ -31,8 +31,8 @@ class Stream {
   /// the buffer then holds its start. When it is not the length of the string in the buffer, the
   /// line holds a zero byte.
   int readline(char* buffer, int size);
-  /// Reads the next line, of any length, likewise.
-  void readline(std::string& line);
+  /// All that has not been read yet.
+  std::string readall();
   /// True once every line has been read, or reading failed.
   bool geteof() const { return next_ == end_; }
   /// True when the file could not be read to its end.
@@ -40,10 +40,7 @@ class Stream {
 
  private:
   void fill();
-  template <class Append>
-  bool read_pieces(Append append);
-
-  static constexpr int BLOCK = 16384;
+  static constexpr int BLOCK = 65536;
 
   int descriptor_;
   bool failed_ = false;

@@ -1,6 +1,7 @@
 #include "host/static_acd.h"
 
 #include <algorithm>
+#include <cstring>
 #include <memory>
 
 #include "host/port_file.h"
@@ -8,46 +9,33 @@
 
 namespace {
 
-constexpr std::string_view BLANKS = " \t";
-
 char revision[] = "$Revision: 1.0 $";
 
 Port_MsgManData& message(int line = __builtin_LINE()) {
   return Port_MsgManData::createObject("Kestrel", "host/static_acd.cpp", line, revision);
 }
 
+constexpr bool is_blank(char c) {
+  return c == ' ' || c == '\t';
+}
+
 std::string_view trimmed(std::string_view text) {
-  const std::size_t start = text.find_first_not_of(BLANKS);
-  if (start == text.npos) return {};
-  return text.substr(start, text.find_last_not_of(BLANKS) - start + 1);
+  while (!text.empty() && is_blank(text.front())) text.remove_prefix(1);
+  while (!text.empty() && is_blank(text.back())) text.remove_suffix(1);
+  return text;
 }
 
 std::string_view without_comment(std::string_view line) {
   for (std::size_t at = line.find('#'); at != line.npos; at = line.find('#', at + 1)) {
-    if (at == 0 || BLANKS.find(line[at - 1]) != BLANKS.npos) return line.substr(0, at);
+    if (at == 0 || is_blank(line[at - 1])) return line.substr(0, at);
   }
   return line;
 }
 
-/// Position of the separator that ends the piece that begins at start; the size of text for the
-/// last piece.
-std::size_t end_of_piece(std::string_view text, std::size_t start, std::string_view separator) {
-  return std::min(text.find(separator, start), text.size());
-}
-
-/// Moves start, the beginning of a piece of text, on by so many pieces. False when there are fewer.
-bool skip_pieces(std::string_view text, std::size_t& start, std::string_view separator,
-                 int pieces) {
-  for (; pieces > 0; --pieces) {
-    const std::size_t end = end_of_piece(text, start, separator);
-    if (end == text.size()) return false;
-    start = end + separator.size();
-  }
-  return true;
-}
-
-std::string_view piece_at(std::string_view text, std::size_t start, std::string_view separator) {
-  return trimmed(text.substr(start, end_of_piece(text, start, separator) - start));
+/// A piece of text by its number; empty when there are fewer.
+std::string_view piece_at(std::string_view text, std::string_view separator, int index) {
+  for (; index > 0 && text.data() != nullptr; --index) StaticAcdRead::take_piece(text, separator);
+  return StaticAcdRead::take_piece(text, separator);
 }
 
 }  // namespace
@@ -62,10 +50,14 @@ StaticAcdRead::StaticAcdRead(const char* path, const char* /*unused*/, char* con
     valid_ = false;
     return;
   }
-  std::string line;
-  for (int number = 1; !stream->geteof(); ++number) {
-    stream->readline(line);
+  text_ = stream->readall();
+  std::size_t start = 0;
+  for (int number = 1; start < text_.size(); ++number) {
+    const std::size_t end = text_.find('\n', start);
+    std::string_view line = std::string_view(text_).substr(start, end - start);
+    if (end != text_.npos && line.ends_with('\r')) line.remove_suffix(1);
     read_line(path, number, line);
+    start = std::min(end, text_.size() - 1) + 1;
   }
   if (stream->failed()) {
     message().issueError("Launcher: Could not read data file \"%s\".\n", path);
@@ -87,41 +79,45 @@ void StaticAcdRead::read_line(const char* path, int number, std::string_view lin
     return;
   }
   if (continues) {
-    if (!last_value_->empty()) *last_value_ += ' ';
-    *last_value_ += content;
+    *last_value_ = joined(*last_value_, content);
     return;
   }
-  const auto [place, is_new] = records_.try_emplace(std::string(key));
-  if (is_new) keys_.emplace_back(place->first);
-  last_value_ = is_new ? &place->second.value : &passed_over_;
+  int& known = index_.place(la_hash(key), is_key(key));
+  last_value_ = &passed_over_;
+  if (known == la_hash_index::NONE) {
+    known = static_cast<int>(keys_.size());
+    keys_.push_back(key);
+    last_value_ = &values_.emplace_back();
+  }
   *last_value_ = trimmed(line.substr(equals + 1));
+}
+
+/// A line end and a blank lie between the two, and make room for the blank between the pieces.
+std::string_view StaticAcdRead::joined(std::string_view value, std::string_view content) {
+  if (value.empty()) return content;
+  char* start = text_.data() + (value.data() - text_.data());
+  start[value.size()] = ' ';
+  std::memmove(start + value.size() + 1, content.data(), content.size());
+  return {start, value.size() + 1 + content.size()};
+}
+
+std::string_view StaticAcdRead::value(std::string_view key) const {
+  const int number = index_.find(la_hash(key), is_key(key));
+  return number != la_hash_index::NONE ? values_[static_cast<std::size_t>(number)]
+                                       : std::string_view();
+}
+
+std::string_view StaticAcdRead::take_piece(std::string_view& text, std::string_view separator) {
+  const std::size_t end = text.find(separator);
+  const std::string_view piece = trimmed(text.substr(0, end));
+  text = end == text.npos ? std::string_view() : text.substr(end + separator.size());
+  return piece;
 }
 
 Port::StringBase<char> StaticAcdRead::GetStringByKey(const char* key, const char* separator,
                                                      short index, const char* separator2,
                                                      short index2) const {
-  std::string_view text = field(key, separator, index);
-  if (separator2 != nullptr) {
-    std::size_t start = 0;
-    if (!skip_pieces(text, start, separator2, index2)) return {};
-    text = piece_at(text, start, separator2);
-  }
+  std::string_view text = piece_at(value(key), separator, index);
+  if (separator2 != nullptr) text = piece_at(text, separator2, index2);
   return Port::StringBase<char>(std::string(text));
-}
-
-std::string_view StaticAcdRead::field(const char* key, std::string_view separator,
-                                      int index) const {
-  const auto found = records_.find(key);
-  if (found == records_.end()) return {};
-  record& asked = found->second;
-  if (asked.separator != separator || asked.index > index) {
-    asked.separator = separator;
-    asked.index = 0;
-    asked.start = 0;
-  }
-  std::size_t start = asked.start;
-  if (!skip_pieces(asked.value, start, separator, index - asked.index)) return {};
-  asked.index = index;
-  asked.start = start;
-  return piece_at(asked.value, start, separator);
 }

@@ -5,9 +5,9 @@
 #include <cstddef>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
+#include "host/hash_index.h"
 #include "host/port_string.h"
 
 /// Reads one static data file. A line that begins with a blank continues the value above it, with
@@ -26,32 +26,33 @@ class StaticAcdRead {
 
   /// The value of key, split at separator, field number index (from 0); when separator2 is not
   /// null, that field split at separator2, part number index2. An empty string when the key, the
-  /// field or the part does not exist. Fields asked for in their order cost the length of the
-  /// value once, not once for each.
+  /// field or the part does not exist.
   Port::StringBase<char> GetStringByKey(const char* key, const char* separator, short index,
                                         const char* separator2, short index2) const;
 
+  /// The same without copies, for who wants all of the fields: the value of key, null when it does
+  /// not exist, which is good as long as this object.
+  std::string_view value(std::string_view key) const;
+  /// Takes the first field from the front of such a text, which is null after the last one.
+  static std::string_view take_piece(std::string_view& text, std::string_view separator);
   /// All keys, in the order of the file; good as long as this object.
   const std::vector<std::string_view>& keys() const { return keys_; }
   /// False when something of the file could not be read or understood.
   bool valid() const { return valid_; }
 
  private:
-  /// A value, and where the field of it that was asked for last begins.
-  struct record {
-    std::string value;
-    std::string separator;
-    int index = 0;
-    std::size_t start = 0;
-  };
-
   void read_line(const char* path, int number, std::string_view line);
-  std::string_view field(const char* key, std::string_view separator, int index) const;
+  auto is_key(std::string_view key) const {
+    return [this, key](int number) { return keys_[static_cast<std::size_t>(number)] == key; };
+  }
+  std::string_view joined(std::string_view value, std::string_view content);
 
-  mutable std::unordered_map<std::string, record> records_;
+  std::string text_;  ///< the file, with the lines of a value joined where the first stands
   std::vector<std::string_view> keys_;
-  std::string* last_value_ = nullptr;
-  std::string passed_over_;  ///< the value of a key that stands earlier too
+  std::vector<std::string_view> values_;  ///< of the same numbers
+  la_hash_index index_;                   ///< of those numbers, by key
+  std::string_view* last_value_ = nullptr;
+  std::string_view passed_over_;  ///< the value of a key that stands earlier too
   bool valid_ = true;
 };
 

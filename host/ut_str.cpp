@@ -57,8 +57,11 @@ int UT_STR::NCompare(const char* a, const char* b, std::size_t n) {
 
 int UT_STR::INCompare(const char* a, const char* b, std::size_t n) {
   for (std::size_t i = 0; i < n; ++i) {
-    const int difference = lower(a[i]) - lower(b[i]);
-    if (difference != 0 || a[i] == '\0') return difference;
+    if (a[i] != b[i]) {
+      const int difference = lower(a[i]) - lower(b[i]);
+      if (difference != 0) return difference;
+    }
+    if (a[i] == '\0') return 0;
   }
   return 0;
 }
@@ -87,25 +90,6 @@ unsigned char UT_STR::AllBlank(const char* s) {
   return *skip_blanks(s) == '\0';
 }
 
-char UT_STR::GetToken(char* line, char* token, const char* delimiters) {
-  const bool blanks_end = std::strchr(delimiters, ' ') != nullptr;
-  const char* start = skip_blanks(line);
-  const char* end = start + std::strcspn(start, delimiters);
-  if (blanks_end) {
-    const char* tab =
-        static_cast<const char*>(std::memchr(start, '\t', static_cast<std::size_t>(end - start)));
-    if (tab != nullptr) end = tab;
-  }
-  const auto length = static_cast<std::size_t>(end - start);
-  std::memcpy(token, start, length);
-  token[length] = '\0';
-
-  const char delimiter = *end == '\t' ? ' ' : *end;
-  const char* rest = *end == '\0' ? end : end + 1;
-  std::memmove(line, rest, Len(rest) + 1);
-  return delimiter;
-}
-
 unsigned char UT_STR::StrToL(const char* s, long& value) {
   if (s[0] == '+' && s[1] != '-') ++s;
   const char* end = s + Len(s);
@@ -122,4 +106,19 @@ void UT_STR::Lower(char* s) {
 
 int UT_STR::IsAlpha(int c) {
   return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
+}
+
+la_text::la_text(const char* chars) {
+  if (chars == nullptr) {
+    room_[LAST] = ABSENT;
+    return;
+  }
+  const std::size_t size = UT_STR::Len(chars) + 1;
+  room_[LAST] = size <= SIZE ? IN_PLACE : ELSEWHERE;
+  if (size <= SIZE) {
+    std::memcpy(room_, chars, size);
+  } else {
+    const char* copy = UT_STR::Dup(chars);
+    std::memcpy(room_, &copy, sizeof copy);
+  }
 }

@@ -4,7 +4,7 @@
 #define KESTREL_HOST_UT_STR_H
 
 #include <cstddef>
-#include <memory>
+#include <cstring>
 
 /// Length, terminator included, of every fixed path buffer.
 constexpr int LA_MAX_PATH = 260;
@@ -41,11 +41,6 @@ class UT_STR {
   static void Trim(char* s);
   /// 1 when s holds nothing but blanks, or nothing at all; else 0.
   static unsigned char AllBlank(const char* s);
-  /// Takes a token from the front of line. Blanks at the front are skipped; the token is the text
-  /// up to the first of the delimiters, and both are removed from line. Where the space is a
-  /// delimiter a tab is one too, and counts as a space. token holds at least as much as line.
-  /// Returns the delimiter that ended the token, or 0 when none did and line is now empty.
-  static char GetToken(char* line, char* token, const char* delimiters);
   /// Reads s as a whole as a decimal integer, possibly signed. Returns 0, and leaves value alone,
   /// when s is anything else or the number does not fit.
   static unsigned char StrToL(const char* s, long& value);
@@ -55,24 +50,52 @@ class UT_STR {
   static int IsAlpha(int c);
 };
 
-/// An owned string, or none. Copies are deep.
+/// An owned string, or none. Copies are deep. Short strings are kept in place: a move moves them.
 class la_text {
  public:
-  la_text() noexcept {}
+  la_text() noexcept { room_[LAST] = ABSENT; }
   /// A copy of chars; null makes an absent text.
-  la_text(const char* chars) : chars_(chars ? UT_STR::Dup(chars) : nullptr) {}
+  la_text(const char* chars);
   la_text(const la_text& other) : la_text(other.get()) {}
-  la_text(la_text&& other) noexcept = default;
+  la_text(la_text&& other) noexcept { take(other); }
   la_text& operator=(const la_text& other) { return *this = la_text(other); }
-  la_text& operator=(la_text&& other) noexcept = default;
-  ~la_text() = default;
+  la_text& operator=(la_text&& other) noexcept {
+    if (this != &other) {
+      release();
+      take(other);
+    }
+    return *this;
+  }
+  ~la_text() { release(); }
 
-  /// The characters, or null for an absent text; good until the text is changed or destroyed.
-  const char* get() const noexcept { return chars_.get(); }
-  operator const char*() const noexcept { return chars_.get(); }
+  /// The characters, or null for an absent text; good until the text is changed, moved or
+  /// destroyed.
+  const char* get() const noexcept {
+    return room_[LAST] == IN_PLACE ? room_ : room_[LAST] == ABSENT ? nullptr : elsewhere();
+  }
+  operator const char*() const noexcept { return get(); }
 
  private:
-  std::unique_ptr<char[]> chars_;
+  /// What the last character of the room says; that of a string that fills it is its terminator.
+  enum : char { IN_PLACE = 0, ABSENT = 1, ELSEWHERE = 2 };
+  static constexpr std::size_t SIZE = 16;
+  static constexpr std::size_t LAST = SIZE - 1;
+
+  char* elsewhere() const noexcept {
+    char* chars;
+    std::memcpy(&chars, room_, sizeof chars);
+    return chars;
+  }
+  void release() noexcept {
+    if (room_[LAST] == ELSEWHERE) delete[] elsewhere();
+  }
+  void take(la_text& other) noexcept {
+    std::memcpy(room_, other.room_, SIZE);
+    other.room_[LAST] = ABSENT;
+  }
+
+  /// The string, or a pointer to it.
+  alignas(char*) char room_[SIZE];
 };
 
 #endif

@@ -46,26 +46,22 @@ class expansion_text {
  public:
   expansion_text(char* buffer, int size) : buffer_(buffer), size_(static_cast<std::size_t>(size)) {}
 
-  /// A place to return to: where a group begins.
+  /// Where a group begins, and how to return there.
   struct mark {
     std::size_t length;
-    std::size_t trailing_blanks;
+    std::size_t blanks;
     std::size_t start;
   };
 
   mark begin_group() {
-    const mark here = {length_, trailing_blanks_, start_};
+    const mark here = {length_, blanks_, start_};
     start_ = length_;
-    trailing_blanks_ = 0;
     return here;
   }
-  void keep_group(const mark& begin) {
-    if (length_ == begin.length) trailing_blanks_ = begin.trailing_blanks;
-    start_ = begin.start;
-  }
+  void keep_group(const mark& begin) { start_ = begin.start; }
   void drop_group(const mark& begin) {
     length_ = begin.length;
-    trailing_blanks_ = begin.trailing_blanks;
+    blanks_ = begin.blanks;
     start_ = begin.start;
   }
 
@@ -73,11 +69,11 @@ class expansion_text {
   /// beginning of the group, one of them remains, or none.
   void join_option(std::string_view piece) {
     const bool empty = length_ == start_;
-    if (piece.starts_with(' ') && (empty || trailing_blanks_ > 0)) {
-      length_ -= trailing_blanks_;
-      trailing_blanks_ = 0;
-      if (length_ > start_) append(" ");
-      piece.remove_prefix(std::min(piece.find_first_not_of(' '), piece.size()));
+    if (piece.starts_with(' ') && (empty || blanks_ < length_)) {
+      if (!empty) length_ = blanks_ + 1;
+      do {
+        piece.remove_prefix(1);
+      } while (piece.starts_with(' '));
     }
     append(piece);
   }
@@ -89,152 +85,133 @@ class expansion_text {
   void append(std::string_view piece) {
     if (length_ < size_)
       std::memcpy(buffer_ + length_, piece.data(), std::min(piece.size(), size_ - length_));
-    length_ += piece.size();
-    const std::size_t last = piece.find_last_not_of(' ');
-    if (last == piece.npos) {
-      trailing_blanks_ += piece.size();
-    } else {
-      trailing_blanks_ = piece.size() - last - 1;
-    }
+    const std::size_t end = length_ + piece.size();
+    while (piece.ends_with(' ')) piece.remove_suffix(1);
+    if (!piece.empty()) blanks_ = length_ + piece.size();
+    length_ = end;
   }
 
   char* buffer_;
   std::size_t size_;
   std::size_t length_ = 0;
-  std::size_t trailing_blanks_ = 0;  ///< of the current group
-  std::size_t start_ = 0;            ///< where the current group begins
+  std::size_t blanks_ = 0;  ///< where the blanks at the end begin; length_ when there are none
+  std::size_t start_ = 0;   ///< where the current group begins
 };
 
-/// How a step of the expansion goes on: a failed one has said why.
-enum class outcome { DONE, NO_VALUE, FAILED };
+/// What a piece or a part of a template gives: something of which a keyword is the reason, nothing
+/// of the kind, or a failure, which has said why.
+enum class outcome { SUBSTITUTED, NOTHING, FAILED };
+
+enum class part_kind { TEMPLATE, OPTIONAL, REPEAT };
+
+constexpr bool begins_construct(char c) {
+  return c == '$' || c == '[' || c == '{';
+}
+
+constexpr bool continues_name(char c) {
+  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
+}
 
 class expander {
  public:
-  expander(const DARRAY_LA_KEYWORD_ENTRY_PTR& entries, expansion_text& output)
-      : entries_(entries), output_(output) {}
+  expander(const LA_KEYWORD_TABLE& keywords, expansion_text& output)
+      : keywords_(keywords), output_(output) {}
 
-  /// One step: expands text behind what the output holds. On success substituted tells whether a
-  /// keyword or a group gave something; the caller drops the output otherwise. position is the
-  /// index of the value that keywords in a repeat group give.
-  bool expand_part(std::string_view text, bool& substituted, bool optional, bool in_repeat,
-                   int position) {
-    substituted = false;
-    if (++la_expand_steps > STEP_LIMIT) return false;
-    while (!text.empty()) {
-      switch (expand_piece(text, substituted, optional, in_repeat, position)) {
-        case outcome::DONE:
+  /// One step: expands the text from at to end behind what the output holds. If it gives nothing,
+  /// the caller drops the output of a group. position is the index of the value that keywords in a
+  /// repeat group give, and 0 elsewhere.
+  outcome expand_part(const char* at, const char* end, part_kind kind, int position) {
+    if (++la_expand_steps > STEP_LIMIT) return outcome::FAILED;
+    outcome all = outcome::NOTHING;
+    while (at != end) {
+      outcome piece = outcome::NOTHING;
+      switch (*at) {
+        case '$':
+          piece = expand_keyword(at, end, kind, position);
+          if (piece == outcome::NOTHING) return piece;
           break;
-        case outcome::NO_VALUE:
-          substituted = false;
-          return true;
-        case outcome::FAILED:
-          return false;
+        case '[':
+          piece = expand_optional(at, end);
+          break;
+        case '{':
+          piece = expand_repeat(at, end, kind);
+          break;
+        default:
+          expand_literal(at, end);
       }
+      if (piece == outcome::FAILED) return piece;
+      if (piece == outcome::SUBSTITUTED) all = piece;
     }
-    return true;
+    return all;
   }
 
  private:
-  /// Takes a piece from the front of text and expands it.
-  outcome expand_piece(std::string_view& text, bool& substituted, bool optional, bool in_repeat,
-                       int position) {
-    switch (text[0]) {
-      case '$':
-        return expand_keyword(text, substituted, optional, in_repeat, position);
-      case '[':
-        return expand_optional(text, substituted);
-      case '{':
-        return expand_repeat(text, substituted, in_repeat);
-      default:
-        output_.join_option(take(text, text.find_first_of("$[{")));
-        return outcome::DONE;
-    }
+  // Each of these expands the piece at the front of the text, and moves on behind it.
+
+  void expand_literal(const char*& at, const char* end) {
+    const char* start = at;
+    at = std::find_if(at + 1, end, begins_construct);
+    output_.join_option(std::string_view(start, at));
   }
 
-  outcome expand_keyword(std::string_view& text, bool& substituted, bool optional, bool in_repeat,
-                         int position) {
-    const std::string_view name = take(text, end_of_name(text)).substr(1);
-    const LA_KEYWORD_ENTRY* entry = find(name);
+  outcome expand_keyword(const char*& at, const char* end, part_kind kind, int position) {
+    const char* start = ++at;
+    if (at != end) at = std::find_if_not(at + 1, end, continues_name);
+    const std::string_view name(start, at);
+    const LA_KEYWORD_ENTRY* entry = keywords_.find(name);
     if (entry == nullptr) return fail(UNDEFINED_KEYWORD, name);
-    if (entry->values.elements[0] == nullptr) {
-      return optional || in_repeat ? outcome::NO_VALUE : fail(NOT_OPTIONAL, name);
+    const DARRAY_NAME& values = entry->values;
+    if (values.elements[0] == nullptr && kind == part_kind::TEMPLATE) {
+      return fail(NOT_OPTIONAL, name);
     }
-    const int index = in_repeat ? position : 0;
-    if (index >= entry->values.count || entry->values.elements[index] == nullptr) {
-      return outcome::NO_VALUE;
+    if (values.elements[0] == nullptr || position >= values.count ||
+        values.elements[position] == nullptr) {
+      return outcome::NOTHING;
     }
-    output_.join_option(entry->values.elements[index]);
-    substituted = true;
-    return outcome::DONE;
+    output_.join_option(values.elements[position]);
+    return outcome::SUBSTITUTED;
   }
 
-  outcome expand_repeat(std::string_view& text, bool& substituted, bool in_repeat) {
-    if (in_repeat) return fail(NESTED_REPEAT);
-    const std::size_t end = text.find('}');
-    if (end == text.npos) return fail(OPEN_REPEAT);
-    const std::string_view body = take(text, end + 1).substr(1, end - 1);
+  outcome expand_repeat(const char*& at, const char* end, part_kind kind) {
+    if (kind == part_kind::REPEAT) return fail(NESTED_REPEAT);
+    const char* body = at + 1;
+    at = std::find(body, end, '}');
+    if (at == end) return fail(OPEN_REPEAT);
+    const char* end_of_body = at++;
+    outcome all = outcome::NOTHING;
     for (int position = 0;; ++position) {
-      bool kept = false;
-      if (!expand_group(body, kept, false, true, position)) return outcome::FAILED;
-      if (!kept) return outcome::DONE;
-      substituted = true;
+      const outcome copy = expand_group(body, end_of_body, part_kind::REPEAT, position);
+      if (copy == outcome::FAILED) return copy;
+      if (copy == outcome::NOTHING) return all;
+      all = copy;
     }
   }
 
-  outcome expand_optional(std::string_view& text, bool& substituted) {
-    const std::size_t end = end_of_optional(text);
-    if (end == text.npos) return fail(OPEN_OPTIONAL);
-    const std::string_view body = take(text, end + 1).substr(1, end - 1);
-    bool kept = false;
-    if (!expand_group(body, kept, true, false, 0)) return outcome::FAILED;
-    if (kept) substituted = true;
-    return outcome::DONE;
+  outcome expand_optional(const char*& at, const char* end) {
+    const char* body = at + 1;
+    at = end_of_optional(body, end);
+    if (at == end) return fail(OPEN_OPTIONAL);
+    return expand_group(body, at++, part_kind::OPTIONAL, 0);
   }
 
-  bool expand_group(std::string_view body, bool& kept, bool optional, bool in_repeat,
-                    int position) {
+  outcome expand_group(const char* at, const char* end, part_kind kind, int position) {
     const expansion_text::mark begin = output_.begin_group();
-    if (!expand_part(body, kept, optional, in_repeat, position)) return false;
-    if (kept) {
+    const outcome result = expand_part(at, end, kind, position);
+    if (result == outcome::SUBSTITUTED) {
       output_.keep_group(begin);
     } else {
       output_.drop_group(begin);
     }
-    return true;
+    return result;
   }
 
-  /// Takes length characters, or all, from the front of text.
-  static std::string_view take(std::string_view& text, std::size_t length) {
-    const std::string_view front = text.substr(0, length);
-    text.remove_prefix(front.size());
-    return front;
-  }
-
-  static std::size_t end_of_name(std::string_view text) {
-    std::size_t end = 2;
-    while (end < text.size() && (UT_STR::IsAlpha(text[end]) || text[end] == '_')) ++end;
-    return end;
-  }
-
-  /// Position of the "]" that balances the "[" at the front of text, or npos.
-  static std::size_t end_of_optional(std::string_view text) {
-    int depth = 0;
-    for (std::size_t i = 1; i < text.size(); ++i) {
-      if (text[i] == '[') ++depth;
-      if (text[i] == ']' && depth-- == 0) return i;
+  /// The "]" that balances the "[" in front of at, or end.
+  static const char* end_of_optional(const char* at, const char* end) {
+    for (int depth = 0; at != end; ++at) {
+      if (*at == '[') ++depth;
+      if (*at == ']' && depth-- == 0) break;
     }
-    return text.npos;
-  }
-
-  /// The first entry whose name the reference begins with: a longer reference is that keyword too.
-  const LA_KEYWORD_ENTRY* find(std::string_view name) const {
-    for (const LA_KEYWORD_ENTRY* entry : entries_) {
-      const std::size_t length = UT_STR::Len(entry->name);
-      if (length <= name.size() && UT_STR::INCompare(name.data(), entry->name, length) == 0) {
-        return entry;
-      }
-    }
-    return nullptr;
+    return at;
   }
 
   static outcome fail(const finding& found, std::string_view name = {}) {
@@ -244,9 +221,27 @@ class expander {
     return outcome::FAILED;
   }
 
-  const DARRAY_LA_KEYWORD_ENTRY_PTR& entries_;
+  const LA_KEYWORD_TABLE& keywords_;
   expansion_text& output_;
 };
+
+constexpr char lower(char c) {
+  return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c;
+}
+
+/// Whether reference begins with name, in any case of letters.
+bool begins_with(std::string_view reference, const char* name) {
+  for (const char c : reference) {
+    if (c != *name && lower(c) != lower(*name)) break;
+    ++name;
+  }
+  return *name == '\0';
+}
+
+/// Letters that differ in case alone have the same.
+constexpr std::size_t bucket(char first) {
+  return static_cast<unsigned char>(first) % 32;
+}
 
 }  // namespace
 
@@ -263,6 +258,10 @@ void LA_KEYWORD_ENTRY::dump() const {
   for (const char* value : values) message(84).issueStatus("%s = %s", name.get(), value);
 }
 
+LA_KEYWORD_TABLE::LA_KEYWORD_TABLE() : entries(10) {
+  std::fill(std::begin(first_), std::end(first_), NONE);
+}
+
 LA_KEYWORD_TABLE::~LA_KEYWORD_TABLE() {
   for (LA_KEYWORD_ENTRY* entry : entries) delete entry;
 }
@@ -272,8 +271,21 @@ LA_KEYWORD_ENTRY& LA_KEYWORD_TABLE::entry(const char* name) {
     if (UT_STR::Compare(entry->name, name) == 0) return *entry;
   }
   auto created = std::make_unique<LA_KEYWORD_ENTRY>(name);
+  for (std::size_t i = 0; i < std::size(first_); ++i) {
+    // An empty name begins every reference.
+    const bool may_match = name[0] == '\0' || i == bucket(name[0]);
+    if (may_match && first_[i] == NONE) first_[i] = entries.count;
+  }
   entries.append(created.get());
   return *created.release();
+}
+
+const LA_KEYWORD_ENTRY* LA_KEYWORD_TABLE::find(std::string_view reference) const {
+  const std::size_t start = bucket(reference.empty() ? '\0' : reference[0]);
+  for (int i = first_[start]; i < entries.count; ++i) {
+    if (begins_with(reference, entries.elements[i]->name)) return entries.elements[i];
+  }
+  return nullptr;
 }
 
 void LA_KEYWORD_TABLE::set_keyword(const char* name, const char* value) {
@@ -291,14 +303,17 @@ void LA_KEYWORD_TABLE::add_keyword(const char* name, const char* value) {
 unsigned char LA_KEYWORD_TABLE::expand(char* options, int size) const {
   la_expand_steps = 0;
   char text[LA_MAX_PATH];
-  if (UT_STR::Copy(text, options) == nullptr) {
+  const std::size_t length = UT_STR::Len(options);
+  if (length >= sizeof text) {
     message().issueError("Launcher: Option string \"%s\" is longer than %d characters\n", options,
                          LA_MAX_PATH - 1);
     return 0;
   }
+  std::memcpy(text, options, length + 1);
   expansion_text output(options, size);
-  bool substituted = false;
-  const bool expanded = expander(entries, output).expand_part(text, substituted, false, false, 0);
+  const bool expanded =
+      expander(*this, output).expand_part(text, text + length, part_kind::TEMPLATE, 0) !=
+      outcome::FAILED;
   if (!expanded || !output.fits()) {
     UT_STR::Copy(options, text);
     if (expanded) {

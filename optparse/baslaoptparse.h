@@ -9,6 +9,9 @@
 #ifndef KESTREL_OPTPARSE_BASLAOPTPARSE_H
 #define KESTREL_OPTPARSE_BASLAOPTPARSE_H
 
+#include <climits>
+#include <string_view>
+
 #include "host/ut_darray.h"
 #include "host/ut_str.h"
 
@@ -37,7 +40,7 @@ using DARRAY_LA_KEYWORD_ENTRY_PTR = UT_TYPED_DARRAY<LA_KEYWORD_ENTRY*>;
 /// The keywords that a template may name, in the order in which they were defined.
 class LA_KEYWORD_TABLE {
  public:
-  LA_KEYWORD_TABLE() : entries(10) {}
+  LA_KEYWORD_TABLE();
   LA_KEYWORD_TABLE(const LA_KEYWORD_TABLE&) = delete;
   LA_KEYWORD_TABLE& operator=(const LA_KEYWORD_TABLE&) = delete;
   ~LA_KEYWORD_TABLE();
@@ -46,6 +49,9 @@ class LA_KEYWORD_TABLE {
   void set_keyword(const char* name, const char* value);
   /// Appends a value to those of the keyword.
   void add_keyword(const char* name, const char* value);
+  /// The first keyword that the reference begins with, in any case of letters: a longer reference
+  /// is that keyword too. Null when there is none.
+  const LA_KEYWORD_ENTRY* find(std::string_view reference) const;
   /// Expands the template in options, a buffer of size characters, in place. The template holds
   /// less than LA_MAX_PATH characters. Returns 1, or 0 after an error message; only a template that
   /// takes more than 100 steps fails without one. After a failure options holds the template, or,
@@ -57,7 +63,11 @@ class LA_KEYWORD_TABLE {
  private:
   LA_KEYWORD_ENTRY& entry(const char* name);
 
+  static constexpr int NONE = INT_MAX;
+
   DARRAY_LA_KEYWORD_ENTRY_PTR entries;
+  /// Where to begin the search, by the first character of a reference.
+  int first_[32];
 };
 
 #endif

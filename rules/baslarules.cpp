@@ -3,9 +3,10 @@
 #include <climits>
 #include <exception>
 #include <string>
-#include <unordered_map>
+#include <string_view>
 #include <vector>
 
+#include "host/hash_index.h"
 #include "host/pm_devkey.h"
 #include "host/pm_pic.h"
 #include "host/port_env.h"
@@ -35,13 +36,18 @@ bool is_none(const char* text) {
   return UT_STR::ICompare(text, "NONE") == 0;
 }
 
+bool is_same(std::string_view a, std::string_view b) {
+  return a.size() == b.size() && UT_STR::INCompare(a.data(), b.data(), a.size()) == 0;
+}
+
 }  // namespace
 
 // ---- Exit-status entries ----
 
 namespace {
 
-/// Operators by their number: what a status value begins with, and what a dump prints.
+/// Operators by their number: what a status value begins with, one character, and what a dump
+/// prints.
 constexpr const char* SYMBOLS[] = {"=", "!", "<", ">", "", "NONE"};
 constexpr unsigned short WRITTEN_OPERATORS = OP_GT + 1;
 
@@ -80,10 +86,9 @@ bool parse_status(const char* text, unsigned short& op, int& code) {
   op = OP_EQ;
   const char* digits = value;
   for (unsigned short i = 0; i < WRITTEN_OPERATORS; ++i) {
-    const std::size_t length = UT_STR::Len(SYMBOLS[i]);
-    if (UT_STR::NCompare(value, SYMBOLS[i], length) != 0) continue;
+    if (*digits != SYMBOLS[i][0]) continue;
     op = i;
-    digits += length;
+    ++digits;
     while (*digits == ' ') ++digits;
     break;
   }
@@ -269,8 +274,8 @@ void fill_for_check(LA_KEYWORD_TABLE& table) {
 }
 
 bool names_a_file(const std::unique_ptr<LA_FILE>& file) {
-  return file && (file->get_name() != nullptr || file->get_ext() != nullptr) &&
-         !file->match_tail("NONE");
+  if (!file) return false;
+  return file->get_ext() != nullptr || (file->get_name() != nullptr && !is_none(file->get_name()));
 }
 
 bool check_template(const LA_RULE& rule, const char* keyword, const char* text,
@@ -307,20 +312,29 @@ bool check_rule(const LA_RULE& rule, const LA_KEYWORD_TABLE& table) {
   return good;
 }
 
+bool redefines(const LA_RULE& a, const LA_RULE& b) {
+  const auto match = [](const char* text, const char* other) {
+    return text == nullptr || other == nullptr ? text == other : UT_STR::ICompare(text, other) == 0;
+  };
+  return match(a.netlist_file->get_name(), b.netlist_file->get_name()) &&
+         match(a.netlist_file->get_ext(), b.netlist_file->get_ext()) &&
+         match(a.target->get_ext(), b.target->get_ext());
+}
+
 /// Reports every pair of rules for the same netlist file and target, the earlier rule first.
 bool check_redefinitions(const DARRAY_LA_RULE_PTR& batch) {
   // For each rule, the next one for the same conversion.
   std::vector<int> next(static_cast<std::size_t>(batch.count), batch.count);
-  std::unordered_map<std::string, int> last;
+  la_hash_index last;
   for (int i = 0; i < batch.count; ++i) {
     const LA_RULE& rule = *batch.elements[i];
     // A target without extension matches none.
     if (rule.target->get_ext() == nullptr) continue;
-    const auto [same, is_first] =
-        last.try_emplace(key_of(rule.netlist_file->get_tail(), rule.target->get_ext()), i);
-    if (is_first) continue;
-    next[static_cast<std::size_t>(same->second)] = i;
-    same->second = i;
+    const char* name = rule.netlist_file->get_name();
+    int& same = last.place(la_hash(name != nullptr ? name : "", hash_of_extensions(rule)),
+                           [&](int other) { return redefines(rule, *batch.elements[other]); });
+    if (same != la_hash_index::NONE) next[static_cast<std::size_t>(same)] = i;
+    same = i;
   }
   bool good = true;
   for (int a = 0; a < batch.count; ++a) {
@@ -375,7 +389,7 @@ struct rule_batch {
 /// One field of a rule, as both kinds of rules file write it. The order is that of the fields of a
 /// record of system rules.
 struct rule_field {
-  const char* keyword;
+  std::string_view keyword;
   /// Stores text in the rule. False when it is not a valid status value.
   bool (*store)(LA_RULE& rule, const char* text);
   /// The line that the finding of the system rules loader on this field is known by: that a
@@ -383,7 +397,7 @@ struct rule_field {
   int line = 0;
   bool required = false;
   /// The keyword in the message on a status value of a user rules file, where it differs.
-  const char* name_in_message = keyword;
+  const char* name_in_message = keyword.data();
 };
 
 /// Makes a field's store function of a setter that cannot fail.
@@ -422,16 +436,16 @@ constexpr rule_field FIELDS[] = {
     {"CheckerWarningStatus", store_checker_status<LA_WARNING>, 727},
     {"CheckerFatalStatus", store_checker_status<LA_FATAL>, 739},
 };
-constexpr short DEPENDENCY_FILES = 2;
-constexpr short LAST_NETLISTER_STATUS = 11;
-constexpr short NUM_FIELDS = std::size(FIELDS);
+constexpr std::size_t DEPENDENCY_FILES = 2;
+constexpr std::size_t LAST_NETLISTER_STATUS = 11;
+constexpr std::size_t NUM_FIELDS = std::size(FIELDS);
 
 }  // namespace
 
 std::vector<const char*> rule_keywords() {
   std::vector<const char*> keywords = {"RuleName"};
   for (const rule_field& field : FIELDS) {
-    if (field.store != nullptr) keywords.push_back(field.keyword);
+    if (field.store != nullptr) keywords.push_back(field.keyword.data());
   }
   return keywords;
 }
@@ -497,19 +511,19 @@ class user_rules_loader {
   }
 
  private:
-  void take_statement(const char* keyword, const char* value) {
-    if (UT_STR::ICompare(keyword, "RuleName") == 0) {
+  void take_statement(std::string_view keyword, const char* value) {
+    if (is_same(keyword, "RuleName")) {
       finish_rule();
       rule_ = std::make_unique<LA_RULE>(value);
       return;
     }
     if (!rule_) return report("%s", "Rule does not have a RuleName");
     for (const rule_field& field : FIELDS) {
-      if (field.store == nullptr || UT_STR::ICompare(keyword, field.keyword) != 0) continue;
+      if (field.store == nullptr || !is_same(keyword, field.keyword)) continue;
       if (!field.store(*rule_, value)) report("Invalid exit code for %s.", field.name_in_message);
       return;
     }
-    report("Unexpected key word %s", keyword);
+    report("Unexpected key word %s", keyword.data());
   }
 
   void finish_rule() {
@@ -598,8 +612,9 @@ class system_rules_loader {
 
   /// Reads all rules. Returns whether there was no error.
   bool read() {
+    std::string_view names = reader_.value("RULES");
     for (int i = 0;; ++i) {
-      const Port::StringBase<char> name = field("RULES", static_cast<short>(i));
+      const std::string name(StaticAcdRead::take_piece(names, ","));
       if (name.empty()) break;
       if (i == SHRT_MAX) {
         message().issueError("Launcher: Rule: %s - There are more than %d rules.\n", name.c_str(),
@@ -615,15 +630,12 @@ class system_rules_loader {
   void move_to(DARRAY_LA_RULE_PTR& set) { batch_.move_to(set); }
 
  private:
-  Port::StringBase<char> field(const char* key, short index) const {
-    return reader_.GetStringByKey(key, ",", index, nullptr, 0);
-  }
-
   void read_rule(const char* name) {
     auto rule = std::make_unique<LA_RULE>(name);
     if (UT_STR::Len(name) >= LA_MAX_PATH) refuse_length(name, "The name");
-    for (short position = 0; position < NUM_FIELDS; ++position) {
-      read_field(*rule, position);
+    std::string_view record = reader_.value(name);
+    for (std::size_t position = 0; position < NUM_FIELDS; ++position) {
+      read_field(*rule, position, StaticAcdRead::take_piece(record, ","));
       if (position == LAST_NETLISTER_STATUS && rule->netlister_status.count == 0) {
         report(703, name,
                "There must be at least one of the following: NetlisterSuccessStatus, "
@@ -635,46 +647,53 @@ class system_rules_loader {
              "There myst be at least one of the following: CheckerSuccessStatus, "
              "CheckerWarningStatus, or CheckerFatalStatus.");
     }
-    if (!field(name, NUM_FIELDS).empty()) {
+    if (!StaticAcdRead::take_piece(record, ",").empty()) {
       message().issueWarning("Launcher: Rule: %s - Only the first %d fields are used.\n", name,
-                             NUM_FIELDS);
+                             static_cast<int>(NUM_FIELDS));
     }
     batch_.add(std::move(rule));
   }
 
-  void read_field(LA_RULE& rule, short position) {
+  void read_field(LA_RULE& rule, std::size_t position, std::string_view given) {
     const rule_field& known = FIELDS[position];
     const char* name = rule.rule_name;
-    const Port::StringBase<char> text = field(name, position);
-    if (text.empty() || text.Compare("NONE", Port::StringBase<char>::IGNORE_CASE) == 0) {
+    char text[LA_MAX_PATH];
+    if (given.empty() || is_same(given, "NONE")) {
       if (known.required) report(known.line, name, std::string(known.keyword) + " is required.");
     } else if (position == DEPENDENCY_FILES) {
-      read_dependency_files(rule);
-    } else if (text.length() >= LA_MAX_PATH) {
-      refuse_length(name, known.keyword);
-    } else if (!known.store(rule, text.c_str())) {
-      report(known.line, name, std::string("Invalid exit code for ") + known.keyword + ".");
+      read_dependency_files(rule, given);
+    } else if (!fits(given, text)) {
+      refuse_length(name, known.keyword.data());
+    } else if (!known.store(rule, text)) {
+      report(known.line, name, "Invalid exit code for " + std::string(known.keyword) + ".");
     }
   }
 
-  void read_dependency_files(LA_RULE& rule) {
+  void read_dependency_files(LA_RULE& rule, std::string_view files) {
+    char text[LA_MAX_PATH];
     for (int i = 0; i <= SHRT_MAX; ++i) {
-      const Port::StringBase<char> part =
-          reader_.GetStringByKey(rule.rule_name, ",", DEPENDENCY_FILES, "|", static_cast<short>(i));
+      const std::string_view part = StaticAcdRead::take_piece(files, "|");
       if (part.empty()) return;
-      if (part.length() >= LA_MAX_PATH) {
+      if (!fits(part, text)) {
         refuse_length(rule.rule_name, "Dependency file");
         continue;
       }
-      const LA_FILE file(part.c_str());
+      const LA_FILE file(text);
       if (file.get_tail() == nullptr || file.get_head() != nullptr) {
         message().issueWarning(
             "Launcher: Rule: %s - Dependency file %s is not a plain file name.\n",
-            rule.rule_name.get(), part.c_str());
+            rule.rule_name.get(), text);
       }
-      rule.add_dependency_file(part.c_str());
+      rule.add_dependency_file(text);
     }
     report(__LINE__, rule.rule_name, "There are too many dependency files.");
+  }
+
+  /// Copies text into a buffer, with a terminator. False when it does not fit.
+  static bool fits(std::string_view text, char (&buffer)[LA_MAX_PATH]) {
+    if (text.size() >= sizeof buffer) return false;
+    buffer[text.copy(buffer, text.size())] = '\0';
+    return true;
   }
 
   void refuse_length(const char* rule_name, const char* what, int line = __builtin_LINE()) {

@@ -1,9 +1,8 @@
 #include "rules/inheritance.h"
 
 #include <algorithm>
-#include <tuple>
-#include <unordered_map>
-#include <vector>
+
+#include "host/hash_index.h"
 
 namespace {
 
@@ -15,87 +14,32 @@ constexpr la_text LA_RULE::*CLEARED_TEXTS[] = {&LA_RULE::netlister_top_options,
                                                &LA_RULE::netlister_options, &LA_RULE::checker,
                                                &LA_RULE::checker_options};
 
-/// The entry of one level that rules without that level take.
-struct status_donor {
-  int rule;
-  int place;
-  LA_STATUS entry;
-};
-
-/// The donors of one list of status entries, one for each level.
-class status_donors {
- public:
-  /// Gives the list what it lacks; what it has of its own, the rules before it take.
-  void serve(DARRAY_LA_STATUS_PTR& list, int rule) {
-    std::vector<status_donor> own;
-    for (int i = 0; i < list.count; ++i) {
-      if (!has_level(own, *list.elements[i])) own.push_back({rule, i, *list.elements[i]});
-    }
-    // As if the later rules were visited one after the other, each from its first entry on.
-    std::sort(donors_.begin(), donors_.end(), [](const status_donor& a, const status_donor& b) {
-      return std::tie(a.rule, a.place) < std::tie(b.rule, b.place);
+/// Adds, of each level that the list lacks, the first entry of the other list.
+void complete(DARRAY_LA_STATUS_PTR& list, const DARRAY_LA_STATUS_PTR& from) {
+  for (const LA_STATUS* entry : from) {
+    const bool has_level = std::any_of(list.begin(), list.end(), [entry](const LA_STATUS* own) {
+      return own->level == entry->level;
     });
-    for (const status_donor& donor : donors_) {
-      if (has_level(own, donor.entry)) continue;
-      list.append(new LA_STATUS(donor.entry));
-      own.push_back(donor);
-    }
-    donors_ = std::move(own);
+    if (!has_level) list.append(new LA_STATUS(*entry));
   }
+}
 
- private:
-  static bool has_level(const std::vector<status_donor>& donors, const LA_STATUS& entry) {
-    return std::any_of(donors.begin(), donors.end(), [&entry](const status_donor& donor) {
-      return donor.entry.level == entry.level;
-    });
+/// Fills what the rule leaves open from another.
+void complete(LA_RULE& rule, const LA_RULE& from) {
+  if (!rule.has_dependency_files() && from.has_dependency_files()) {
+    rule.copy_dependency_files(from);
   }
-
-  std::vector<status_donor> donors_;
-};
-
-/// For one pair of extensions: for each field, the nearest of the rules visited that has it.
-struct donors {
-  const LA_RULE* dependency_files = nullptr;
-  const LA_RULE* texts[std::size(TEXTS)] = {};
-  const LA_RULE* netlister_dir = nullptr;
-  const LA_RULE* checker_dir = nullptr;
-  status_donors netlister_status;
-  status_donors checker_status;
-};
-
-/// Rules are visited from the last to the first. One that has a field becomes its donor; one that
-/// lacks it takes it from the donor. So each takes from the nearest later rule that had the field
-/// from its loader: where a donor's own "NONE" is already cleared, the taker's would be as well.
-void serve(LA_RULE& rule, int index, donors& from) {
-  if (rule.has_dependency_files()) {
-    from.dependency_files = &rule;
-  } else if (from.dependency_files != nullptr) {
-    rule.copy_dependency_files(*from.dependency_files);
+  for (la_text LA_RULE::*text : TEXTS) {
+    if (rule.*text == nullptr && from.*text != nullptr) rule.*text = from.*text;
   }
-
-  for (std::size_t i = 0; i < std::size(TEXTS); ++i) {
-    la_text& text = rule.*TEXTS[i];
-    if (text != nullptr) {
-      from.texts[i] = &rule;
-    } else if (from.texts[i] != nullptr) {
-      text = from.texts[i]->*TEXTS[i];
-    }
+  if (rule.netlister_dir_flag == DIR_UNSET && from.netlister_dir_flag != DIR_UNSET) {
+    rule.set_netlister_dir(from.netlister_dir.get(), from.netlister_dir_flag);
   }
-
-  if (rule.netlister_dir_flag != DIR_UNSET) {
-    from.netlister_dir = &rule;
-  } else if (from.netlister_dir != nullptr) {
-    rule.set_netlister_dir(from.netlister_dir->netlister_dir.get(),
-                           from.netlister_dir->netlister_dir_flag);
+  if (rule.checker_dir_flag == DIR_UNSET && from.checker_dir_flag != DIR_UNSET) {
+    rule.set_checker_dir(from.checker_dir.get(), from.checker_dir_flag);
   }
-  if (rule.checker_dir_flag != DIR_UNSET) {
-    from.checker_dir = &rule;
-  } else if (from.checker_dir != nullptr) {
-    rule.set_checker_dir(from.checker_dir->checker_dir.get(), from.checker_dir->checker_dir_flag);
-  }
-
-  from.netlister_status.serve(rule.netlister_status, index);
-  from.checker_status.serve(rule.checker_status, index);
+  complete(rule.netlister_status, from.netlister_status);
+  complete(rule.checker_status, from.checker_status);
 }
 
 void clear_none(LA_RULE& rule) {
@@ -106,22 +50,29 @@ void clear_none(LA_RULE& rule) {
 
 }  // namespace
 
-std::string key_of(const char* first, const char* second) {
-  std::string key(first != nullptr ? first : "");
-  key += '/';
-  key += second != nullptr ? second : "";
-  UT_STR::Lower(key.data());
-  return key;
+std::uint32_t hash_of_extensions(const LA_RULE& rule) {
+  const char* from = rule.netlist_file->get_ext();
+  const char* to = rule.target->get_ext();
+  return la_hash(to != nullptr ? to : "", la_hash(from != nullptr ? from : ""));
 }
 
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
-  std::unordered_map<std::string, donors> by_extensions;
+  // From the last rule to the first: the next one for the same extensions is complete by then. What
+  // it lacks has no later one either, or it is kept out.
+  la_hash_index next;
   for (int i = rules.count - 1; i >= 0; --i) {
     LA_RULE& rule = *rules.elements[i];
     const char* from = rule.netlist_file->get_ext();
     const char* to = rule.target->get_ext();
     // A missing extension matches none.
-    if (from != nullptr && to != nullptr) serve(rule, i, by_extensions[key_of(from, to)]);
+    if (from != nullptr && to != nullptr) {
+      int& later = next.place(hash_of_extensions(rule), [&](int other) {
+        return rules.elements[other]->netlist_file->match_ext(from) &&
+               rules.elements[other]->target->match_ext(to);
+      });
+      if (later != la_hash_index::NONE) complete(rule, *rules.elements[later]);
+      later = i;
+    }
     clear_none(rule);
   }
 }

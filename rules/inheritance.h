@@ -2,7 +2,7 @@
 #ifndef KESTREL_RULES_INHERITANCE_H
 #define KESTREL_RULES_INHERITANCE_H
 
-#include <string>
+#include <cstdint>
 
 #include "rules/baslarules.h"
 
@@ -12,7 +12,7 @@
 /// "NONE" are then cleared. Takes time in proportion to the number of rules.
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules);
 
-/// Two texts, either of which may be null, as one key that ignores the case of letters.
-std::string key_of(const char* first, const char* second);
+/// A hash of the two extensions of a rule, either of which may be missing.
+std::uint32_t hash_of_extensions(const LA_RULE& rule);
 
 #endif

@@ -1,11 +1,45 @@
 #include "rules/statement_reader.h"
 
+#include <array>
 #include <cstring>
+#include <string_view>
+
+namespace {
+
+/// The characters that end a token: the end of the line, blanks and delimiters.
+using token_ends = std::array<bool, 256>;
+
+constexpr token_ends with_delimiters(std::string_view delimiters) {
+  token_ends ends = {};
+  for (const char c : {'\0', ' ', '\t'}) ends[static_cast<unsigned char>(c)] = true;
+  for (const char c : delimiters) ends[static_cast<unsigned char>(c)] = true;
+  return ends;
+}
+
+constexpr token_ends KEYWORD_ENDS = with_delimiters("=;");
+constexpr token_ends VALUE_ENDS = with_delimiters("\";");
+constexpr token_ends STATEMENT_ENDS = with_delimiters(";");
+
+/// Copies the token at the front of line, behind blanks, and moves line on behind what ends it.
+/// Returns that character, a blank as a space; 0 when it is the end of the line.
+char take_token(char*& line, char* token, const token_ends& ends) {
+  while (*line == ' ' || *line == '\t') ++line;
+  const char* start = line;
+  while (!ends[static_cast<unsigned char>(*line)]) ++line;
+  const auto length = static_cast<std::size_t>(line - start);
+  std::memcpy(token, start, length);
+  token[length] = '\0';
+  const char end = *line;
+  if (end != '\0') ++line;
+  return end == '\t' ? ' ' : end;
+}
+
+}  // namespace
 
 la_statement_reader::item_kind la_statement_reader::next() {
   while (!ended_) {
     item_kind item = NOTHING;
-    if (!UT_STR::AllBlank(line_)) {
+    if (!UT_STR::AllBlank(rest_)) {
       item = step();
     } else if (stream_.geteof()) {
       item = end_of_file();
@@ -23,6 +57,7 @@ la_statement_reader::item_kind la_statement_reader::read_line() {
     return MANY_LINES;
   }
   const int length = stream_.readline(line_, sizeof line_);
+  rest_ = line_;
   ++line_number_;
   const auto kept = static_cast<int>(UT_STR::Len(line_));
   if (kept != length) {
@@ -50,12 +85,12 @@ la_statement_reader::item_kind la_statement_reader::go(state next_state, item_ki
 la_statement_reader::item_kind la_statement_reader::step() {
   switch (state_) {
     case KEYWORD: {
-      const char end = UT_STR::GetToken(line_, keyword_, " =;");
+      const char end = take_token(rest_, keyword_, KEYWORD_ENDS);
       if (end == ' ') return go(EQUALS);
       return end == '=' ? go(VALUE) : go(SKIP, EXPECTING_KEYWORD);
     }
     case EQUALS: {
-      const char end = UT_STR::GetToken(line_, token_, " =;");
+      const char end = take_token(rest_, token_, KEYWORD_ENDS);
       return end == '=' && *token_ == '\0' ? go(VALUE) : go(SKIP, EXPECTING_EQUALS);
     }
     case VALUE:
@@ -63,18 +98,18 @@ la_statement_reader::item_kind la_statement_reader::step() {
     case QUOTED:
       return step_quoted();
     case SEMICOLON: {
-      const char end = UT_STR::GetToken(line_, token_, " ;");
+      const char end = take_token(rest_, token_, STATEMENT_ENDS);
       return end == ';' && *token_ == '\0' ? go(KEYWORD, STATEMENT) : go(SKIP, EXPECTING_SEMICOLON);
     }
     case SKIP:
-      return UT_STR::GetToken(line_, token_, " ;") == ';' ? go(KEYWORD) : NOTHING;
+      return take_token(rest_, token_, STATEMENT_ENDS) == ';' ? go(KEYWORD) : NOTHING;
   }
   return NOTHING;
 }
 
 la_statement_reader::item_kind la_statement_reader::step_value() {
   value_refused_ = false;
-  switch (UT_STR::GetToken(line_, value_, " \";")) {
+  switch (take_token(rest_, value_, VALUE_ENDS)) {
     case ' ':
       return go(SEMICOLON);
     case '"':
@@ -87,13 +122,13 @@ la_statement_reader::item_kind la_statement_reader::step_value() {
 }
 
 la_statement_reader::item_kind la_statement_reader::step_quoted() {
-  char* quote = UT_STR::FindChar(line_, '"');
+  char* quote = UT_STR::FindChar(rest_, '"');
   if (quote != nullptr) *quote = '\0';
-  const item_kind result = append_to_value(line_);
+  const item_kind result = append_to_value(rest_);
   if (quote == nullptr) {
-    line_[0] = '\0';
+    *rest_ = '\0';
   } else {
-    std::memmove(line_, quote + 1, UT_STR::Len(quote + 1) + 1);
+    rest_ = quote + 1;
     state_ = value_refused_ ? SKIP : SEMICOLON;
   }
   return result;

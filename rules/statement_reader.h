@@ -58,6 +58,7 @@ class la_statement_reader {
   bool value_refused_ = false;
   bool ended_ = false;
   char line_[LA_MAX_PATH] = "";
+  char* rest_ = line_;  ///< what has not been taken of the line
   char token_[LA_MAX_PATH] = "";
   char keyword_[LA_MAX_PATH] = "";
   char value_[LA_MAX_PATH] = "";

@@ -160,6 +160,27 @@ r\n= x\nr=.a,.k,,n,,,,,,0                | "~/share/data/larules.acd", line 2: E
   EXPECT_LT(found.find("x - The name is longer than 259 characters.\n"), found.size());
 }
 
+TEST_F(Rules, ManyAndLong) {
+  // Each user rule takes a netlister, as long as its number, from a system rule.
+  std::string user, records, names, completed, redefined;
+  for (int i = 0; i < 200; ++i) {
+    const std::string n = std::to_string(i), netlister(static_cast<std::size_t>(i) + 1, 'n');
+    const std::string kind = n + std::string(static_cast<std::size_t>(i) / 8, 'e');
+    user += "RuleName=u" + n + ";NetlistFile=." + kind + ";TargetExtension=.k;\n";
+    names += "r" + n + (i < 199 ? "," : "\n");
+    records += "r" + n + "=." + kind + ",.K,," + netlister + ",,,,,,0\n";
+    completed += "u" + n + ",." + kind + ",.k," + netlister + ",,,0,,,,0,,success = 0\n";
+    redefined += "Rule r" + n + " redefines rule s" + n + "\n";
+  }
+  tree.write("u.urf", user);
+  tree.write("share/data/larules.acd", "RULES=" + names + records);
+  EXPECT_EQ(loaded(nullptr, "u").substr(0, completed.size()), completed);
+  const std::string more = replaced("," + replaced(names, "\n", ""), ",r", ",\n s");
+  tree.write("share/data/larules.acd", "RULES=" + replaced(names, "\n", "") + more + "\n" +
+                                           records + replaced("\n" + records, "\nr", "\ns"));
+  EXPECT_EQ(loaded(nullptr, nullptr), redefined + "(0)");
+}
+
 TEST_F(Rules, FamilyDefaultAndReplacement) {
   const Variable roots("CORVANE", tree.expand("~/share:~/share2:~/share3").c_str());
   tree.write("share/data/devices.acd", "D = fam, P, 1\n");
