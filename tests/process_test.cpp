@@ -143,7 +143,9 @@ TEST_F(Guest, ACommandShowsMessagesInOrderAndAtOnce) {
   EXPECT_EQ(tree.shorten(tree.read("log")),
             "Launcher: Executing nl out=\"d.edf\"\nLauncher: Executing nl say=a out=\"d.kbo\"\n"
             "a\n~/d.kbo\n" +
-                again + "Launcher: d.kbo is up to date\n~/d.kbo\n");
+                again +
+                "Launcher: d.kbo is up to date\n~/d.kbo\n"
+                "kestrel-launch: 2 names: 1 built, 1 up to date\n");
   tree.remove("d.kbo");
   std::string seen;
   run({"/bin/sh", "-c", "exec " + command + " -l say=now d >log 2>&1"}, "", [&](pid_t launch) {
