@@ -35,6 +35,10 @@ TEST(Sessions, Command) {
   expect_sessions("command.txt");
 }
 
+TEST(Sessions, UserRules) {
+  expect_sessions("user_rules.txt");
+}
+
 TEST(Sessions, Faults) {
   expect_sessions("faults.txt");
 }
