@@ -12,9 +12,10 @@ extern "C" void __sanitizer_malloc_hook(const volatile void* /*memory*/, std::si
 }
 
 static const std::vector<std::pair<std::string, std::vector<const char*>>> KEYWORDS = {
-    {"part", {"dev1"}},  {"quiet", {nullptr}}, {"libraries", {"/a", "/b"}},
-    {"in", {"top.edf"}}, {"lead", {"  v  "}},  {"empty", {""}},
-    {"round", {"a]"}},   {"curly", {"a}"}},    {"partial", {"never"}}};
+    {"part", {"dev1"}},     {"quiet", {nullptr}}, {"libraries", {"/a", "/b"}},
+    {"in", {"top.edf"}},    {"lead", {"  v  "}},  {"empty", {""}},
+    {"round", {"a]"}},      {"curly", {"a}"}},    {"partial", {"never"}},
+    {"gap", {"1", nullptr}}};
 
 struct Table : LA_KEYWORD_TABLE {
   Table() {
@@ -47,6 +48,7 @@ TEST(Templates, Expand) {
 [ $quiet]  -p   $part   $lead  x$lead$lead      | <-p   dev1 v x  v v  >
 $PART$part2{-$empty }$infile$partial[x]{x}      | <dev1dev12- top.edfdev1>
 -[a $part [b $quiet]]{c[ $quiet$lead]$part}     | <-a dev1 cdev1>
+{$gap }                                         | <1 >
 [$part $other_1]                                | 217 Undefined keyword "other_" in option string\n)");
 }
 
