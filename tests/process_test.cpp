@@ -178,8 +178,7 @@ TEST_F(Guest, AnInterruptedCommandEndsWhatItStarted) {
         ::kill(row[1] == "group" ? -command : command, number);
       }
     };
-    const Ran ran =
-        run({KESTREL_LAUNCH, "-f", "-l", row[2], "-l", "leave=60", "d"}, "", interrupted);
+    const Ran ran = run({KESTREL_LAUNCH, "-f", "-l", row[2], "-l", "leave=60", "d"}, interrupted);
     EXPECT_EQ(ran.status, 128 + std::stoi(row[0]));
     EXPECT_EQ(ran.err,
               "Launcher: Executing nl out=\"d.edf\"\nLauncher: Executing nl " + row[2] +

@@ -1,7 +1,4 @@
-// Rules: their records, both kinds of rules files, validation and inheritance.
-
-#include <algorithm>
-#include <random>
+// Rules: exit codes, system rules files, and which files are read.
 #include <regex>
 
 #include "rules/baslarules.h"
@@ -19,15 +16,10 @@ static std::string listed(const LA_RULE_SET& set) {
       all.insert(all.size() - 1, "+" + shown({rule->dependency_files->elements[i]->get_file()}));
     }
   }
-  return replaced(replaced(all, " status", ""), ",.a,.k,,,,0,,,,0,,success = 0\n", "@;");
+  return replaced(all, " status", "");
 }
 
 struct Rules : testing::Test {
-  /// Writes the user rules file. "@r" is a rule r from .a to .k with one status.
-  void write_rules(const std::string& text) {
-    const char* rule = "RuleName=$1;NetlistFile=.a;TargetExtension=.k;NetlisterSuccessStatus=0;";
-    tree.write("u.urf", std::regex_replace(text, std::regex("@(\\w)"), rule));
-  }
   /// What loading says, errors of system rules with their lines, and the rules when they are valid,
   /// else their number.
   std::string loaded(const char* part, const char* user) const {
@@ -39,7 +31,7 @@ struct Rules : testing::Test {
       if (has_line) all += replaced(origin, "rules/baslarules.cpp:", "").substr(0, 4);
       all += text;
     }
-    for (const char* word : {"Launcher: ", "Rule: ", "\"u\", line "}) all = replaced(all, word, "");
+    all = replaced(replaced(all, "Launcher: ", ""), "Rule: ", "");
     all += set.is_valid ? listed(set) : "(" + std::to_string(set.rules.count) + ")";
     return tree.shorten(all);
   }
@@ -69,76 +61,6 @@ TEST_F(Rules, StatusValues) {
 nOnE         | 5 0:
 NONE1        | no
 2147483648   | no)");
-}
-
-TEST_F(Rules, Dumps) {
-  const auto dump = [this](const std::string& text) {
-    write_rules(text);
-    Messages messages;
-    LA_RULE_SET(nullptr, "u").dump(false);
-    LA_RULE_SET(nullptr, "u").dump(true);
-    return tree.shorten(messages.take());
-  };
-  expect_table(dump, R"(
-@r Netlister=nl;NetlisterDirectory=d;CheckerFatalStatus=!0; | S Rule r: .a => .k  nl \nS \nS Rule: r\nS Netlist File: .a\nS Target: .k\nS Netlister: nl\nS Netlister Options: \nS Netlister Top Options: \nS Netlister Directory Flag: 4  Dir: ~/d/\nS Checker: \nS Checker Options:\nS Checker Directory Flag: 0  Dir: \nS success status = 0\nS fatal status ! 0\n)");
-}
-
-TEST_F(Rules, UserFiles) {
-  const auto load_all_variants = [this](const std::string& text) {
-    write_rules(text);
-    const std::string result = loaded(nullptr, "u");
-    std::string lower = tree.read("u.urf");
-    UT_STR::Lower(lower.data());
-    for (const std::string& other : {text + "\n", replaced(text, "\n", "\r\n") + "\r\n",
-                                     "\xEF\xBB\xBF" + text, replaced(text, " ", "\t"), lower}) {
-      write_rules(other);
-      EXPECT_EQ(replaced(loaded(nullptr, "u"), "\t", " "), result) << other;
-    }
-    return result;
-  };
-  expect_table(load_all_variants, R"(
-// c\n\t\n //                                           |
-@r Netlister =\nn ; NetlisterOptions\t\n = "a; "\n;     | r,.a,.k,n,a; ,,0,,,,0,,success = 0\n
-@r Netlister = "-p \n\n // c\n  x" ;                    | r,.a,.k,-p   x,,,0,,,,0,,success = 0\n
-@r Netlister = x ; Netlister = a/b"c" ; Checker = ;     | r,.a,.k,a/bc,,,0,,,,0,,success = 0\n
-@r @s NetlistFile = b.a ;                               | s,b.a,.k,,,,0,,,,0,,success = 0\nr@;
-RuleName\n= r ;\n@r ; x ;                               | 1: Expecting keyword\n3: Expecting keyword\n(1)
-a b=; a b = ; c ;\nd ; @r                               | 1: Expecting "="\n1: Expecting "="\n1: Expecting "="\n(1)
-@r Netlister = a//b ;\n                                 | 1: Expecting value\nUnexpected end of file\n(1)
-@r Netlister = a b ;\n@s Checker = "a" b;               | 1: Expecting ";"\n2: Expecting ";"\nUnexpected end of file\n(2)
-1=b; @r\n1 = b ; a = "b                                 | 1: Rule does not have a RuleName\n2: Unexpected key word 1\nUnexpected end of file\n(1)
-@r NetlisterSuccessStatus=x;NetlisterWarningStatus=x;NetlisterFatalStatus=x;\nCheckerSuccessStatus=x;CheckerWarningStatus=x;CheckerFatalStatus=x; | 1: Invalid exit code for NetlisterSuccessStatus.\n1: Invalid exit code for NetlisterWarningStatus.\n1: Invalid exit code for NetlisterFatalStatus.\n2: Invalid exit code for CheckerSuccesStatus.\n2: Invalid exit code for CheckerWarningStatus.\n2: Invalid exit code for CheckerFatalStatus.\n(1)
-@r TargetExtension=x.k;                                 | Rule r only extension is used. Ignoring name x\nr,.a,x.k,,,,0,,,,0,,success = 0\n
-RuleName=r; NetlistFile=none;                           | Rule r does not define a NetlistFile\nRule r does not define a TargetExtension\n(1)
-@r NetlistFile=d/; Netlister=None; TargetExtension=NONE; | Rule r does not define a NetlistFile\nRule r does not define a TargetExtension\nRule r can not set Netlister to NONE\n(1)
-@r NetlisterOptions="[$part][$family][$device][$pkg][$speed]$infile";\nNetlisterTopOptions="[$aul$ignore_locs$add_pads$quiet]{$libraries}$outfile$output"; | r,.a,.k,,[$part][$family][$device][$pkg][$speed]$infile,[$aul$ignore_locs$add_pads$quiet]{$libraries}$outfile$output,0,,,,0,,success = 0\n
-@r NetlisterTopOptions=$part; NetlisterOptions=$outfile]; | Keyword "part" is not optional\nError parsing NetlisterTopOptions "$part" for rule r\nMissing '[' in options string\nError parsing NetlisterOptions "junk]" for rule r\n(1)
-@r @s TargetExtension=.K; @t NetlistFile=.A;            | Rule r redefines rule s\nRule r redefines rule t\nRule s redefines rule t\n(3)
-@r NetlistFile=x.a; @s TargetExtension=.l;\n@t          | r,x.a,.k,,,,0,,,,0,,success = 0\ns,.a,.l,,,,0,,,,0,,success = 0\nt@;)");
-}
-
-TEST_F(Rules, UserFileLimits) {
-  const auto reads = [this](const std::string& text) {
-    write_rules(text);
-    return loaded(nullptr, "u");
-  };
-  EXPECT_EQ(reads("//" + std::string(257, 'x') + "\n@r"), "r@;");
-  EXPECT_EQ(reads("//" + std::string(258, 'x')), "1: Line is longer than 259 characters\n(0)");
-  const auto value = "@r Netlister=\"" + std::string(150, 'x') + "\n" + std::string(109, 'x');
-  EXPECT_EQ(reads(value + "\";").substr(0, 268), "r,.a,.k," + std::string(259, 'x') + ",");
-  EXPECT_EQ(reads(replaced(value, "Netlister", "RuleName") + "x\nx\"; @s"),
-            "2: Value is longer than 259 characters\n(2)");
-  EXPECT_EQ(reads("@r\n" + std::string(2, '\0') + "\n@s"), "2: Line holds a zero byte\n(2)");
-}
-
-TEST_F(Rules, UserFileNames) {
-  write_rules("@r");
-  tree.write("a.txt", tree.read("u.urf"));
-  expect_table([this](const std::string& name) { return loaded(nullptr, name.c_str()); }, R"(
-u     | r@;
-a.txt | r@;)");
-  const std::string name(260, 'x');
-  EXPECT_EQ(loaded(nullptr, name.c_str()).find(name + "\" is longer than 259 characters"), 22);
 }
 
 TEST_F(Rules, SystemFiles) {
@@ -186,12 +108,16 @@ TEST_F(Rules, FamilyDefaultAndReplacement) {
   tree.write("share/data/devices.acd", "D = fam, P, 1\n");
   tree.write("share2/data/fam/larules.acd", "RULES=f\nf=.A,.K,e.x|.z,n,,,,,,NONE,2\n");
   tree.write("share3/data/larules.acd", "RULES=d\nd=.a,.k,.y,m,top,opt,$OUTPUT,c,d,9,8,!0,7\n");
-  write_rules("@u NetlisterOptions=NONE;NetlisterFatalStatus=none;");
+  tree.write("u.urf", R"(RuleName=u; NetlistFile=.a; TargetExtension=.k; NetlisterOptions=NONE;
+NetlisterSuccessStatus=0; NetlisterFatalStatus=none;)");
+  tree.write("bad.urf", "RuleName=r; x");
   EXPECT_EQ(loaded("d-p", "u"),
             R"(u,.a,.k,n,,top,3,,c,,4,~/d/,success = 0,fatal NONE 0,warning = 2,success = 7+e.x+.z
 f,.A,.K,n,opt,top,3,,c,,4,~/d/,warning = 2,success = 9,fatal ! 0,success = 7+e.x+.z
 d,.a,.k,m,opt,top,3,,c,,4,~/d/,success = 9,warning = 8,fatal ! 0,success = 7+.y
 )");
+  EXPECT_EQ(loaded("d-p", "bad"),
+            "\"bad\", line 1: Expecting keyword\nUnexpected end of file\n(1)");
   Messages messages;
   EXPECT_EQ(LA_RULE_SET("x", "u").rules.count, 1);
   EXPECT_EQ(messages.records.at(0).origin, "rules/baslarules.cpp:549 $Revision: 1.12 $");
@@ -203,63 +129,4 @@ d,.a,.k,m,opt,top,3,,c,,4,~/d/,success = 9,warning = 8,fatal ! 0,success = 7+.y
   const std::string trace = "CVN_KESTREL_ALLOW_PLF is set. Using rules file for plf2kdb.\n";
   EXPECT_EQ(replaced(loaded("D", nullptr), trace, "T"),
             replaced("TTpp", "p", "p,.a,.k,n,,,0,,,,0,,success = 0\n"));
-}
-
-static constexpr la_text LA_RULE::*TEXTS[] = {&LA_RULE::netlister, &LA_RULE::netlister_top_options,
-                                              &LA_RULE::netlister_options, &LA_RULE::checker};
-
-/// What a rule r takes from a later one l.
-static void complete(LA_RULE& r, const LA_RULE& l) {
-  if (!r.netlist_file->match_ext(l.netlist_file->get_ext())) return;
-  if (!r.target->match_ext(l.target->get_ext())) return;
-  if (!r.has_dependency_files()) r.copy_dependency_files(l);
-  if (!r.netlister_dir_flag) r.set_netlister_dir(l.netlister_dir.get(), l.netlister_dir_flag);
-  if (!r.checker_dir_flag) r.set_checker_dir(l.checker_dir.get(), l.checker_dir_flag);
-  for (const auto text : TEXTS) {
-    if (r.*text == nullptr) r.*text = l.*text;
-  }
-  for (const auto list : {&LA_RULE::netlister_status, &LA_RULE::checker_status}) {
-    for (const LA_STATUS* entry : l.*list) {
-      const auto same = [entry](const LA_STATUS* own) { return own->level == entry->level; };
-      if (std::any_of((r.*list).begin(), (r.*list).end(), same)) continue;
-      (r.*list).append(new LA_STATUS(*entry));
-    }
-  }
-}
-
-TEST_F(Rules, AreCompletedFromLaterOnes) {
-  // Each statement of a rule in its variants.
-  const auto rows = table(R"(
-NetlistFile=#.a; | NetlistFile=#.A; | NetlistFile=#.b; | NetlistFile=#;
-TargetExtension=.k; | TargetExtension=.K; | TargetExtension=.l; | TargetExtension=l;
-Netlister=m; | Netlister=n; | // none
-NetlisterTopOptions=x; | NetlisterTopOptions=NONE; | // none | // none
-NetlisterOptions=y; | NetlisterOptions=none; | // none
-NetlisterDirectory=NONE; | NetlisterDirectory=x; | // none | // none
-Checker=c; CheckerFatalStatus=6; | Checker=None; CheckerFatalStatus=none; | // none
-CheckerDirectory=none; | CheckerDirectory=$SOURCE; | CheckerDirectory=y; | // none
-NetlisterWarningStatus=1; | NetlisterWarningStatus=NONE; | // none
-NetlisterFatalStatus=2; NetlisterFatalStatus=3; | NetlisterFatalStatus=4; | // none
-CheckerSuccessStatus=4; CheckerWarningStatus=5; | CheckerWarningStatus=7; | // none)");
-  std::mt19937 random(1);
-  for (int round = 0; round < 50; ++round) {
-    std::string text;
-    for (char name = 'a'; name <= 't'; ++name) {
-      text += std::string("RuleName=") + name + "; NetlisterSuccessStatus=0;\n";
-      for (const auto& row : rows) text += replaced(row[random() % row.size()], "#", {name}) + "\n";
-    }
-    tree.write("u.urf", text);
-    Messages messages;
-    const LA_RULE_SET completed(nullptr, "u");
-    // An invalid part leaves the rules as they were read.
-    LA_RULE_SET set("no part", "u");
-    for (LA_RULE** rule = set.rules.begin(); rule != set.rules.end(); ++rule) {
-      for (LA_RULE** later = rule + 1; later != set.rules.end(); ++later) complete(**rule, **later);
-      for (const auto text : TEXTS) {
-        if (shown({(*rule)->*text}).size() == 4) (*rule)->*text = nullptr;  // "NONE"
-      }
-    }
-    ASSERT_EQ(set.rules.count, 20);
-    ASSERT_EQ(listed(completed), listed(set)) << text;
-  }
 }

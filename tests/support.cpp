@@ -118,15 +118,13 @@ std::string Tree::shell(const std::string& commands) const {
   return shorten(run({"sh", "-c", "exec 2>&1; PATH=" KESTREL_BIN_DIR ":$PATH;" + commands}).out);
 }
 
-Ran run(const std::vector<std::string>& words, const std::string& input,
-        const std::function<void(pid_t)>& meanwhile) {
+Ran run(const std::vector<std::string>& words, const std::function<void(pid_t)>& meanwhile) {
   std::string base = fs::temp_directory_path() / "kestrel-run-XXXXXX";
   ::mkdtemp(base.data());
-  std::ofstream(base + "/in", std::ios::binary) << input;
   const pid_t child = ::fork();
   if (child == 0) {
     ::setpgid(0, 0);
-    ::dup2(::open((base + "/in").c_str(), O_RDONLY), 0);
+    ::dup2(::open("/dev/null", O_RDONLY), 0);
     ::dup2(::open((base + "/out").c_str(), O_CREAT | O_WRONLY, 0600), 1);
     ::dup2(::open((base + "/err").c_str(), O_CREAT | O_WRONLY, 0600), 2);
     std::vector<char*> arguments;

@@ -91,10 +91,10 @@ struct Ran {
   std::string err;
 };
 
-/// Runs a program in the current directory, with nothing on its standard input unless some is
-/// given. meanwhile is called with its number, which is also that of a process group.
+/// Runs a program in the current directory, with nothing on its standard input. meanwhile is called
+/// with its number, which is also that of a process group.
 Ran run(
-    const std::vector<std::string>& words, const std::string& input = "",
+    const std::vector<std::string>& words,
     const std::function<void(pid_t)>& meanwhile = [](pid_t) {});
 
 /// The content of a file.
