@@ -90,6 +90,25 @@ unsigned char UT_STR::AllBlank(const char* s) {
   return *skip_blanks(s) == '\0';
 }
 
+char UT_STR::GetToken(char* line, char* token, const char* delimiters) {
+  const bool blanks_end = std::strchr(delimiters, ' ') != nullptr;
+  const char* start = skip_blanks(line);
+  const char* end = start + std::strcspn(start, delimiters);
+  if (blanks_end) {
+    const char* tab =
+        static_cast<const char*>(std::memchr(start, '\t', static_cast<std::size_t>(end - start)));
+    if (tab != nullptr) end = tab;
+  }
+  const auto length = static_cast<std::size_t>(end - start);
+  std::memcpy(token, start, length);
+  token[length] = '\0';
+
+  const char delimiter = *end == '\t' ? ' ' : *end;
+  const char* rest = *end == '\0' ? end : end + 1;
+  std::memmove(line, rest, Len(rest) + 1);
+  return delimiter;
+}
+
 unsigned char UT_STR::StrToL(const char* s, long& value) {
   if (s[0] == '+' && s[1] != '-') ++s;
   const char* end = s + Len(s);

@@ -41,6 +41,11 @@ class UT_STR {
   static void Trim(char* s);
   /// 1 when s holds nothing but blanks, or nothing at all; else 0.
   static unsigned char AllBlank(const char* s);
+  /// Takes a token from the front of line. Blanks at the front are skipped; the token is the text
+  /// up to the first of the delimiters, and both are removed from line. Where the space is a
+  /// delimiter a tab is one too, and counts as a space. token holds at least as much as line.
+  /// Returns the delimiter that ended the token, or 0 when none did and line is now empty.
+  static char GetToken(char* line, char* token, const char* delimiters);
   /// Reads s as a whole as a decimal integer, possibly signed. Returns 0, and leaves value alone,
   /// when s is anything else or the number does not fit.
   static unsigned char StrToL(const char* s, long& value);

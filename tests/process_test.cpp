@@ -148,7 +148,7 @@ TEST_F(Guest, ACommandShowsMessagesInOrderAndAtOnce) {
                 "kestrel-launch: 2 names: 1 built, 1 up to date\n");
   tree.remove("d.kbo");
   std::string seen;
-  run({"/bin/sh", "-c", "exec " + command + " -l say=now d >log 2>&1"}, "", [&](pid_t launch) {
+  run({"/bin/sh", "-c", "exec " + command + " -l say=now d >log 2>&1"}, [&](pid_t launch) {
     for (int i = 0; i < 20'000 && !seen.ends_with("now\n"); ++i, ::usleep(1000))
       seen = tree.read("log");
     ::kill(launch, SIGTERM);

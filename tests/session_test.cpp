@@ -42,3 +42,7 @@ TEST(Sessions, UserRules) {
 TEST(Sessions, Faults) {
   expect_sessions("faults.txt");
 }
+
+TEST(Sessions, Explanations) {
+  expect_sessions("explanations.txt");
+}

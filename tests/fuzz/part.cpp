@@ -21,6 +21,6 @@ void examine(const std::string& input, Tree& tree) {
   EXPECT_EQ(spelled(lower(name).c_str()), spelled(name.c_str()));
   const StaticAcdRead table("share/data/devices.acd", nullptr, nullptr, 1, 0, 1);
   for (const std::string_view key : table.keys()) {
-    EXPECT_EQ(spelled(key.data()).empty(), !table.valid()) << key;
+    EXPECT_EQ(spelled(std::string(key).c_str()).empty(), !table.valid()) << key;
   }
 }
