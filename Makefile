@@ -14,9 +14,10 @@ BENCH_PACKAGES = $(BUILD_PACKAGES) ninja-build python3 strace valgrind
 COOKBOOK_PACKAGES = $(BUILD_PACKAGES) python3 yosys nextpnr-ice40 fpga-icestorm lepton-eda \
   berkeley-abc m4 zip unzip
 CLUSTER_PACKAGES = $(BUILD_PACKAGES) python3 slurm-wlm munge parallel
+COMPARE_PACKAGES = $(BUILD_PACKAGES) python3 ninja-build
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo cookbook cluster test bench sanitize fuzz lint package clean help
+.PHONY: all build demo cookbook cluster compare test bench sanitize fuzz lint package clean help
 
 all: build
 
@@ -43,6 +44,12 @@ cluster:
 	@$(MAKE) --no-print-directory build >/dev/null
 	@tools/with-slurm sh -c 'echo "export SLURM_CONF=$$SLURM_CONF" >$(BUILD)/slurm.env && \
 	  tools/cookbook $(BUILD) docs/cluster.md --setup $(BUILD)/slurm.env'
+
+# The same tasks for the launcher, make and ninja: the table of docs/why-not-make.md.
+compare:
+	@tools/setup $(COMPARE_PACKAGES)
+	@$(MAKE) --no-print-directory build >/dev/null
+	@tools/compare $(BUILD) docs/why-not-make.md
 
 test:
 	@tools/setup $(TEST_PACKAGES)
@@ -93,6 +100,7 @@ help:
 	@echo "make demo      set up, build, and resolve the examples"
 	@echo "make cookbook  set up, build, and run the recipes of docs/cookbook.md"
 	@echo "make cluster   the same for docs/cluster.md, beside a Slurm of this machine"
+	@echo "make compare   give the same tasks to the launcher, make and ninja"
 	@echo "make test      set up, build, and pass all tests"
 	@echo "make bench     measure the launcher beside make and ninja; ROWS=\"1 3\" QUICK=1"
 	@echo "make sanitize  pass all tests under the sanitizers"
