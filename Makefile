@@ -13,9 +13,11 @@ PACKAGE_PACKAGES = $(BUILD_PACKAGES) dpkg-dev file
 BENCH_PACKAGES = $(BUILD_PACKAGES) ninja-build python3 strace valgrind
 COOKBOOK_PACKAGES = $(BUILD_PACKAGES) python3 yosys nextpnr-ice40 fpga-icestorm lepton-eda \
   berkeley-abc m4 zip unzip
+CLUSTER_PACKAGES = $(BUILD_PACKAGES) python3 slurm-wlm munge parallel
+COMPARE_PACKAGES = $(BUILD_PACKAGES) python3 ninja-build
 LINT_PACKAGES = clang-format-14 clang-tidy-14
 
-.PHONY: all build demo cookbook test bench sanitize fuzz lint package clean help
+.PHONY: all build demo cookbook cluster compare test bench sanitize fuzz lint package clean help
 
 all: build
 
@@ -35,6 +37,19 @@ cookbook:
 	@tools/setup $(COOKBOOK_PACKAGES)
 	@$(MAKE) --no-print-directory build >/dev/null
 	@tools/cookbook $(BUILD) docs/cookbook.md
+
+# The guide for clusters, beside a Slurm of this machine.
+cluster:
+	@tools/setup $(CLUSTER_PACKAGES)
+	@$(MAKE) --no-print-directory build >/dev/null
+	@tools/with-slurm sh -c 'echo "export SLURM_CONF=$$SLURM_CONF" >$(BUILD)/slurm.env && \
+	  tools/cookbook $(BUILD) docs/cluster.md --setup $(BUILD)/slurm.env'
+
+# The same tasks for the launcher, make and ninja: the table of docs/why-not-make.md.
+compare:
+	@tools/setup $(COMPARE_PACKAGES)
+	@$(MAKE) --no-print-directory build >/dev/null
+	@tools/compare $(BUILD) docs/why-not-make.md
 
 test:
 	@tools/setup $(TEST_PACKAGES)
@@ -84,6 +99,8 @@ help:
 	@echo "make           build the library and the command"
 	@echo "make demo      set up, build, and resolve the examples"
 	@echo "make cookbook  set up, build, and run the recipes of docs/cookbook.md"
+	@echo "make cluster   the same for docs/cluster.md, beside a Slurm of this machine"
+	@echo "make compare   give the same tasks to the launcher, make and ninja"
 	@echo "make test      set up, build, and pass all tests"
 	@echo "make bench     measure the launcher beside make and ninja; ROWS=\"1 3\" QUICK=1"
 	@echo "make sanitize  pass all tests under the sanitizers"
