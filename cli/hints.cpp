@@ -2,7 +2,8 @@
 
 #include <unistd.h>
 
-#include <algorithm>
+#include <map>
+#include <set>
 #include <sstream>
 #include <string_view>
 
@@ -66,23 +67,26 @@ std::string hint_on_options(const char* options) {
 
 std::vector<std::string> hints_on(const LA_RULE_SET& set) {
   std::vector<std::string> hints;
+  std::set<std::string> given;
+  std::map<std::string, std::string> on_netlisters;  // PATH is searched once for each
   const std::vector<relation> relations = relations_of(set);
   for (int i = 0; i < set.rules.count; ++i) {
     const LA_RULE& rule = *set.rules.elements[i];
-    const bool is_run =
-        rule.netlister != nullptr && UT_STR::_Compare(rule.netlister, "NOT_SUPPORTED") != 0;
+    const char* netlister = rule.netlister;
+    const bool is_run = netlister != nullptr && UT_STR::_Compare(netlister, "NOT_SUPPORTED") != 0;
     std::vector<std::string> found = {
         hint_on_relation(rule, relations[static_cast<std::size_t>(i)])};
     if (is_run) {
-      found.push_back(hint_on_netlister(rule));
+      const auto [known, is_new] = on_netlisters.try_emplace(netlister);
+      if (is_new) known->second = hint_on_netlister(rule);
+      found.push_back(known->second);
       found.push_back(hint_on_directory(rule));
       found.push_back(hint_on_options(rule.netlister_options));
       if (rule.netlister_top_options) found.push_back(hint_on_options(rule.netlister_top_options));
     }
     for (const std::string& hint : found) {
       const std::string line = std::string("rule ") + rule.rule_name.get() + ": " + hint;
-      const bool is_new = std::find(hints.begin(), hints.end(), line) == hints.end();
-      if (!hint.empty() && is_new) hints.push_back(line);
+      if (!hint.empty() && given.insert(line).second) hints.push_back(line);
     }
   }
   return hints;

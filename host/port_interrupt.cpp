@@ -12,10 +12,22 @@ namespace {
 // A signal handler works on these, at any moment.
 std::atomic<int> requests = 0;
 std::atomic<int> first_signal = 0;
+std::atomic<long long> first_moment = 0;
 std::atomic<int> passed_on = 0;  ///< how many of the requests the running child has got
 std::atomic<pid_t> running = 0;  ///< a process, minus a process group, or 0
 std::atomic<bool> groups = false;
+static_assert(std::atomic<long long>::is_always_lock_free);
 static_assert(std::atomic<int>::is_always_lock_free && std::atomic<bool>::is_always_lock_free);
+
+/// timeout(1) signals a process, then its group: the same signal so soon is the same request.
+constexpr long long SAME_MOMENT = 100'000'000;
+
+/// Nanoseconds of a clock that is never set.
+long long now() {
+  timespec time = {};
+  ::clock_gettime(CLOCK_MONOTONIC, &time);
+  return time.tv_sec * 1'000'000'000LL + time.tv_nsec;
+}
 
 /// Sends the child what it has not got yet. A handler calls this in the midst of anything, also of
 /// itself: whoever raises passed_on does the sending, so that no request is sent twice.
@@ -45,10 +57,13 @@ bool is_gone(pid_t group) {
 
 void Port_Interrupt::Request(int signal) {
   const int error = errno;
-  int none = 0;
-  first_signal.compare_exchange_strong(none, signal);
-  ++requests;
-  pass_on_requests();
+  int earlier = 0;
+  if (first_signal.compare_exchange_strong(earlier, signal)) first_moment = now();
+  const bool is_same = earlier == signal && now() - first_moment < SAME_MOMENT;
+  if (!is_same) {
+    ++requests;
+    pass_on_requests();
+  }
   errno = error;
 }
 

@@ -11,8 +11,9 @@
 class Port_Interrupt {
  public:
   /// Passes the signal on to the running child, from the second call on kills it, and lets no
-  /// other child start. Run waits for the child as ever. Lasts until Clear. May be called from a
-  /// signal handler and from any thread; leaves errno alone.
+  /// other child start. Run waits for the child as ever. Lasts until Clear. The same signal again
+  /// within a tenth of a second counts once. May be called from a signal handler and from any
+  /// thread; leaves errno alone.
   static void Request(int signal);
   /// The signal of the first Request since the start of the process or since Clear; 0 for none.
   static int Requested();

@@ -35,6 +35,22 @@ TEST_F(Host, StringsAndArrays) {
   EXPECT_TRUE(*static_cast<char**>(array.getaddr(9)) == nullptr && array.elements[0] == nullptr);
 }
 
+// A cell is delimiters, then a line; the result is token, delimiter and rest, between "/".
+TEST_F(Host, Tokens) {
+  const auto token_of = [](const std::string& cell) {
+    char line[LA_MAX_PATH], token[LA_MAX_PATH];
+    UT_STR::Copy(line, cell.substr(cell.find('/') + 1).c_str());
+    const char end = UT_STR::GetToken(line, token, cell.substr(0, cell.find('/')).c_str());
+    return std::string(token) + "/" + (end != '\0' ? std::string(1, end) : "0") + "/" + line;
+  };
+  expect_table(token_of, R"(
+; =/RuleName = r1 ; | RuleName/ /= r1 ;
+; =/= r1 ;          | /=/ r1 ;
+; ;/\t a\tb        | a/ /b
+;/ a\tb;;           | a\tb/;/;
+;/                  | /0/)");
+}
+
 TEST_F(Host, LinesAcrossBlocks) {
   const std::string block(16384, 'x');
   const std::string lines[] = {block.substr(4), "", "\xEF\xBB\xBF\r", block + block, "a\r"};
