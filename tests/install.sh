@@ -14,7 +14,7 @@ cmake --install "$build" --prefix "$dir/first" >/dev/null
 mv first moved
 sed -n '/^```cpp$/,/^```$/{/^```/!p}' "$source/docs/embedding.md" | sed '/^}/q' >host.cpp
 cat >CMakeLists.txt <<END
-cmake_minimum_required(VERSION 3.21)
+cmake_minimum_required(VERSION 3.22)
 project(host LANGUAGES CXX)
 if(SOURCE)
   add_subdirectory(\${SOURCE} kestrel)
