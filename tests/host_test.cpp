@@ -82,9 +82,11 @@ TEST_F(Host, Messages) {
   Port_MsgManData::createObject("Kestrel", "f.cpp", 1, "r1").issueWarning("100%");
   EXPECT_EQ(outer.take(), "W 100%");
   // Stray, overlong, cut off, overlong, surrogate, beyond the last character.
-  for (const std::string bad : {"\x80", "\xC0\xAF", "\xC3", "\xE0\x80\x80", "\xED\xA0\x80", "\xF5"})
+  for (const std::string bad :
+       {"\x80", "\xC0\xAF", "\xC3", "\xE0\x80\x80", "\xED\xA0\x80", "\xF5"}) {
     const std::string marks = replaced(std::string(bad.size(), '?'), "?", "\uFFFD");
-  EXPECT_EQ(to_utf8(from_utf8(bad + "\u07FF")), marks + "\u07FF") << bad.size();
+    EXPECT_EQ(to_utf8(from_utf8(bad + "\u07FF")), marks + "\u07FF") << bad.size();
+  }
 }
 
 TEST_F(Host, InstallationRoots) {
