@@ -478,8 +478,10 @@ const char* LA_FULLFILE::get_external_path() const {
   la_path_text below = current_directory();
   Port::File::makeunixpath(below.chars());
   below.add_slash();
-  const bool is_below =
-      below.fits() && UT_STR::NCompare(full.chars(), below.chars(), below.length()) == 0;
+  // What is left must not become a full name: "/w//d" is in "/w", and not "/d".
+  const bool is_below = below.fits() &&
+                        UT_STR::NCompare(full.chars(), below.chars(), below.length()) == 0 &&
+                        full.chars()[below.length()] != '/';
   if (!full.fits()) return nullptr;
   la_path_text text;
   return text.add("\"").add(full.chars() + (is_below ? below.length() : 0)).add("\"").in_ring(4);

@@ -6,13 +6,15 @@
 
 #include <atomic>
 #include <cerrno>
+#include <limits>
 
 namespace {
 
 // A signal handler works on these, at any moment.
 std::atomic<int> requests = 0;
 std::atomic<int> first_signal = 0;
-std::atomic<long long> first_moment = 0;
+constexpr long long NEVER = std::numeric_limits<long long>::max();
+std::atomic<long long> first_moment = NEVER;
 std::atomic<int> passed_on = 0;  ///< how many of the requests the running child has got
 std::atomic<pid_t> running = 0;  ///< a process, minus a process group, or 0
 std::atomic<bool> groups = false;
@@ -74,6 +76,7 @@ int Port_Interrupt::Requested() {
 void Port_Interrupt::Clear() {
   requests = 0;
   first_signal = 0;
+  first_moment = NEVER;
 }
 
 void Port_Interrupt::SetOwnGroups(bool own) {

@@ -40,10 +40,6 @@ Port::FileStatus status_of(const char* path) {
   return path != nullptr ? Port::File::status(path) : Port::FileStatus();
 }
 
-Port::FileStatus status_of(const LA_FULLFILE& file) {
-  return status_of(file.get_fullfile());
-}
-
 /// A full name without its directory.
 const char* tail_of(const char* path) {
   return std::strrchr(path, '/') + 1;
@@ -172,6 +168,7 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
     ++errors;
     return LA_FAILED;
   }
+  if (is_interrupted(given)) return LA_FAILED;
 
   lookup where(given);
   in_searchpaths.clear();
@@ -250,12 +247,16 @@ short LA_LAUNCHER::find_native(lookup& where, bool named_kbc, found_file& source
 
 // ---- Search-path resolution ----
 
-/// What the file system knows of a file while the current directory is home. Below it, a name is
-/// looked up from there: that spares the file system the way down to it.
-Port::FileStatus LA_LAUNCHER::status_at_home(const char* path) const {
+/// The name of a file while the current directory is home. Below it, that is a relative one: it
+/// spares the file system the way down to it.
+const char* LA_LAUNCHER::at_home(const char* path) const {
   const bool is_below = path != nullptr && std::string_view(path).starts_with(home_name) &&
                         path[home_name.size()] != '/';
-  return status_of(is_below ? path + home_name.size() : path);
+  return is_below ? path + home_name.size() : path;
+}
+
+Port::FileStatus LA_LAUNCHER::status_at_home(const char* path) const {
+  return status_of(at_home(path));
 }
 
 /// Looks where the name says, then in the search directories.
@@ -463,14 +464,17 @@ class LA_LAUNCHER::working_directory {
   explicit working_directory(const LA_DIR& home) : home_(home) {}
   working_directory(const working_directory&) = delete;
   working_directory& operator=(const working_directory&) = delete;
-  ~working_directory() {
-    // A netlister may have moved or removed the directory of that name.
-    if (left_ && !left_->enter()) home_.chdir();
-  }
+  ~working_directory() { leave(); }
 
   void enter(const LA_DIR& directory) {
     if (!left_) left_.emplace();
     directory.chdir();
+  }
+  bool is_home() const { return !left_; }
+  /// Goes home.
+  void leave() {
+    // A netlister may have moved or removed the directory of that name.
+    if (left_ && !left_->enter()) home_.chdir();
   }
 
  private:
@@ -561,13 +565,13 @@ void LA_LAUNCHER::set_options(la_command_options& options) const {
 }
 
 /// Compares the rule's dependency files, which lie beside the source, with the output.
-LA_BUILD_DECISION LA_LAUNCHER::decide_by_dependency_files(build_step& step) {
+LA_BUILD_DECISION LA_LAUNCHER::decide_by_dependency_files(build_step& step) const {
   if (!step.rule->has_dependency_files()) return LA_BUILD_UP_TO_DATE;
   for (const LA_FILE* dependency : *step.rule->dependency_files) {
     LA_FULLFILE file(step.source);
     if (dependency->get_ext() != nullptr) file.set_ext(dependency->get_ext());
     if (dependency->get_name() != nullptr) file.set_name(dependency->get_name());
-    const Port::FileStatus status = status_of(file);
+    const Port::FileStatus status = status_at_home(file.get_fullfile());
     if (!status.exists || status.time <= step.output_status.time) continue;
     step.dependency = file.get_fullfile();
     step.dependency_status = status;
@@ -579,6 +583,8 @@ LA_BUILD_DECISION LA_LAUNCHER::decide_by_dependency_files(build_step& step) {
 /// Decides whether the step's netlister must run.
 void LA_LAUNCHER::decide(build_step& step) const {
   const LA_RULE& rule = *step.rule;
+  step.dependency.clear();
+  step.dependency_status = {};
   if (rule.netlister != nullptr && UT_STR::_Compare(rule.netlister, "NOT_SUPPORTED") == 0) {
     step.decision = LA_BUILD_UNSUPPORTED;
     return;
@@ -658,6 +664,8 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
   }
   const LA_FULLFILE input = input_of(step);
   const LA_FULLFILE output = output_of(step.source, *step.rule);
+  const Port::FileStatus before =
+      directory.is_home() ? status_at_home(step.output) : status_of(step.output);
   enter_directory(*step.rule, input, output, directory);
   std::string command;
   if (!make_command(*step.rule, input, output, options, top, command)) return false;
@@ -665,18 +673,20 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
   ++runs;
   if (explanation != nullptr) explanation->steps.back().command = command;
   if (Port_Env::GetEnv("LA_TEST") != nullptr) return true;
-  const Port::FileStatus before = status_of(step.output);
   if (execute(*step.rule, command)) return true;
+  directory.leave();
   distrust(step.output, before);
   return false;
 }
 
 /// Sees to it that what a failed run has written is not taken for up to date later: it gets the
-/// oldest time stamp that there is. Its content stays for whoever wants to look into it.
+/// oldest time stamp that there is. Its content stays for whoever wants to look into it. The
+/// current directory is home.
 void LA_LAUNCHER::distrust(const char* output, const Port::FileStatus& before) {
-  const Port::FileStatus after = status_of(output);
+  const char* file = at_home(output);
+  const Port::FileStatus after = status_of(file);
   if (!after.exists || (before.exists && after.time == before.time)) return;
-  if (Port::File::setoldest(output)) {
+  if (Port::File::setoldest(file)) {
     if (!detail) return;
     message().issueStatus(
         "Launcher: %s comes from a failed run, its time stamp is set back: it will be made again\n",
@@ -684,7 +694,7 @@ void LA_LAUNCHER::distrust(const char* output, const Port::FileStatus& before) {
     return;
   }
   // The time stamp of another user's file cannot be set.
-  const bool is_removed = Port::File::remove(output);
+  const bool is_removed = Port::File::remove(file);
   message().issueWarning(
       "Launcher: %s comes from a failed run, and its time stamp could not be set back: %s\n",
       tail_of(output), is_removed ? "it is removed" : "remove it");

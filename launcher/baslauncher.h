@@ -111,6 +111,7 @@ class LA_LAUNCHER {
   bool is_interrupted(const LA_FULLFILE& file);
   void find_named(lookup& where);
   short find_native(lookup& where, bool named_kbc, found_file& source, char* netlist_path);
+  const char* at_home(const char* path) const;
   Port::FileStatus status_at_home(const char* path) const;
   bool find_file(lookup& where, const char* ext, found_file& found);
   void note(const char* path, LA_EXPLANATION::SIGHTING sighting) const;
@@ -131,7 +132,7 @@ class LA_LAUNCHER {
   LA_FULLFILE input_of(const build_step& step) const;
   void set_options(la_command_options& options) const;
   void decide(build_step& step) const;
-  static LA_BUILD_DECISION decide_by_dependency_files(build_step& step);
+  LA_BUILD_DECISION decide_by_dependency_files(build_step& step) const;
   void note(const build_step& step) const;
   bool report_decision(const build_step& step);
   bool run_netlister(const build_step& step, shared_by_runs& shared, unsigned char top);
