@@ -569,7 +569,7 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
         file_name, LA_MAX_PATH - 1);
     return false;
   }
-  if (full_name == nullptr || Port::File::missing(full_name)) {
+  if (!file.exists()) {
     message().issueError("Launcher: User rules file \"%s\" does not exist.\n",
                          full_name != nullptr ? full_name : file_name);
     return false;
