@@ -75,7 +75,8 @@ std::string file_of(const LA_FILE& file) {
   return std::string(name != nullptr ? name : "") + "." + (ext != nullptr ? ext : "");
 }
 
-std::string line_of(const LA_EXPLANATION::CONSIDERED& considered) {
+/// width: of the column of names.
+std::string line_of(const LA_EXPLANATION::CONSIDERED& considered, std::size_t width) {
   constexpr std::array VERDICTS = {
       "taken",
       "not taken: what it needs is not there",
@@ -86,7 +87,7 @@ std::string line_of(const LA_EXPLANATION::CONSIDERED& considered) {
   };
   const LA_RULE& rule = *considered.rule;
   const std::string kinds = file_of(*rule.netlist_file) + " => " + file_of(*rule.target);
-  return "  " + indented(rule.rule_name.get(), 10) + indented(kinds, 16) +
+  return "  " + indented(rule.rule_name.get(), width) + indented(kinds, 16) +
          VERDICTS[considered.verdict] + "\n";
 }
 
@@ -191,9 +192,13 @@ std::string explained(const outcome& found, const LA_EXPLANATION& why) {
   std::string text = found.name + ": " + answer(found, why) + "\n";
   if (!why.probes.empty()) text += sightings(why.probes);
   std::string rules;
+  std::size_t width = 10;
+  for (const LA_EXPLANATION::CONSIDERED& considered : why.rules) {
+    width = std::max(width, UT_STR::Len(considered.rule->rule_name) + 2);
+  }
   for (const LA_EXPLANATION::CONSIDERED& considered : why.rules) {
     // One that was wanted more than once has one line.
-    const std::string line = line_of(considered);
+    const std::string line = line_of(considered, width);
     if (rules.find(line) == rules.npos) rules += line;
   }
   if (!rules.empty()) text += "\nRules:\n" + rules;

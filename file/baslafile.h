@@ -210,8 +210,9 @@ class LA_FULLROOT {
  private:
   char chars[LA_MAX_PATH];
   std::size_t length = 0;
-  std::size_t room =
-      0;  ///< for dot, extension and terminator; less than in chars when that is normal
+  /// For dot, extension and terminator: less than chars has left where the name was brought into
+  /// its normal form.
+  std::size_t room = 0;
 };
 
 #endif

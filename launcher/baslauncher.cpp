@@ -764,8 +764,7 @@ bool LA_LAUNCHER::make_command(const LA_RULE& rule, const LA_FULLFILE& input,
   if (options.keep_names_in_place(start, options_template, command)) return true;
   message().issueError(
       "Launcher: The name of a file or directory, or a library entry, would change the arguments "
-      "of "
-      "%s, which is therefore not run: %s\n",
+      "of %s, which is therefore not run: %s\n",
       rule.netlister.get(), command.c_str());
   ++errors;
   return false;

@@ -564,8 +564,7 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
   if (full_name == nullptr && file.get_name() != nullptr) {
     message().issueError(
         "Launcher: User rules file \"%s\" has no full name of at most %d characters, or the "
-        "current "
-        "directory cannot be used.\n",
+        "current directory cannot be used.\n",
         file_name, LA_MAX_PATH - 1);
     return false;
   }
