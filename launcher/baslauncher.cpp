@@ -495,8 +495,6 @@ struct LA_LAUNCHER::shared_by_runs {
 short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
                                unsigned char top, char* netlist_path) {
   std::optional<shared_by_runs> shared;
-  // A device table that is damaged, which makes the rules invalid, is reported before the steps.
-  if (!ok) shared.emplace(*this);
   const LA_FILE tail(source.file.get_tail());
   LA_FULLROOT outputs(*output_dir, tail.get_root());
   build_step step = {
