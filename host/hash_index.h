@@ -8,10 +8,27 @@
 #include <utility>
 #include <vector>
 
-/// A hash of text, which ignores the case of letters; start is that of what stands before it.
-inline std::uint32_t la_hash(std::string_view text, std::uint32_t start = 2166136261) {
-  for (const char c : text) start = (start ^ (static_cast<unsigned char>(c) | 0x20U)) * 16777619;
+constexpr std::uint32_t LA_HASH_START = 2166136261;
+
+/// The hash of a text that goes on with c. It ignores the case of letters.
+constexpr std::uint32_t la_hash(char c, std::uint32_t start) {
+  return (start ^ (static_cast<unsigned char>(c) | 0x20U)) * 16777619;
+}
+/// The hash of text; start is that of what stands before it.
+inline std::uint32_t la_hash(std::string_view text, std::uint32_t start = LA_HASH_START) {
+  for (const char c : text) start = la_hash(c, start);
   return start;
+}
+/// Likewise of a zero-terminated text; null is like an empty one.
+inline std::uint32_t la_hash(const char* text, std::uint32_t start = LA_HASH_START) {
+  while (text != nullptr && *text != '\0') start = la_hash(*text++, start);
+  return start;
+}
+
+/// The element of this number.
+template <class Table>
+auto& la_at(Table& table, int number) {
+  return table[static_cast<std::size_t>(number)];
 }
 
 /// Numbers by the hash of what they stand for. It holds no keys, which makes it small: whoever asks

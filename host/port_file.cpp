@@ -23,7 +23,8 @@ __int64 nanoseconds(const timespec& time) {
 
 }  // namespace
 
-Stream::Stream(int descriptor) : descriptor_(descriptor), block_(new char[BLOCK]) {
+Stream::Stream(int descriptor, std::size_t size)
+    : descriptor_(descriptor), size_(size), block_(new char[BLOCK]) {
   fill();
   static constexpr char BYTE_ORDER_MARK[] = {'\xEF', '\xBB', '\xBF'};
   if (end_ - next_ >= 3 && std::memcmp(next_, BYTE_ORDER_MARK, 3) == 0) {
@@ -69,6 +70,7 @@ int Stream::readline(char* buffer, int size) {
 
 std::string Stream::readall() {
   std::string text;
+  text.reserve(size_);
   for (; !geteof(); fill()) text.append(next_, end_);
   return text;
 }
@@ -159,7 +161,7 @@ Stream* File::open(const char* path, Stream::Access access, bool /*flag*/) {
     ::close(descriptor);
     return nullptr;
   }
-  return new Stream(descriptor);
+  return new Stream(descriptor, static_cast<std::size_t>(opened.st_size));
 }
 
 bool File::close(Stream* stream) {

@@ -19,9 +19,9 @@ class Stream {
  public:
   enum Access { READ = 1 };
 
-  /// Takes over the file descriptor, which stands at the start of the file. A UTF-8 byte order
-  /// mark there is skipped.
-  explicit Stream(int descriptor);
+  /// Takes over the file descriptor, which stands at the start of a file of so many bytes:
+  /// readall() makes room for these at once. A UTF-8 byte order mark at the start is skipped.
+  Stream(int descriptor, std::size_t size);
   Stream(const Stream&) = delete;
   Stream& operator=(const Stream&) = delete;
   ~Stream();
@@ -43,6 +43,7 @@ class Stream {
   static constexpr int BLOCK = 65536;
 
   int descriptor_;
+  std::size_t size_;
   bool failed_ = false;
   std::unique_ptr<char[]> block_;
   const char* next_ = nullptr;

@@ -4,6 +4,7 @@
 #include <cstring>
 #include <memory>
 
+#include "host/blanks.h"
 #include "host/port_file.h"
 #include "host/port_msgman.h"
 
@@ -15,25 +16,15 @@ Port_MsgManData& message(int line = __builtin_LINE()) {
   return Port_MsgManData::createObject("Kestrel", "host/static_acd.cpp", line, revision);
 }
 
-constexpr bool is_blank(char c) {
-  return c == ' ' || c == '\t';
-}
-
-std::string_view trimmed(std::string_view text) {
-  while (!text.empty() && is_blank(text.front())) text.remove_prefix(1);
-  while (!text.empty() && is_blank(text.back())) text.remove_suffix(1);
-  return text;
-}
-
 std::string_view without_comment(std::string_view line) {
   for (std::size_t at = line.find('#'); at != line.npos; at = line.find('#', at + 1)) {
-    if (at == 0 || is_blank(line[at - 1])) return line.substr(0, at);
+    if (at == 0 || la_is_blank(line[at - 1])) return line.substr(0, at);
   }
   return line;
 }
 
 /// A piece of text by its number; empty when there are fewer.
-std::string_view piece_at(std::string_view text, std::string_view separator, int index) {
+std::string_view piece_at(std::string_view text, char separator, int index) {
   for (; index > 0 && text.data() != nullptr; --index) StaticAcdRead::take_piece(text, separator);
   return StaticAcdRead::take_piece(text, separator);
 }
@@ -67,11 +58,11 @@ StaticAcdRead::StaticAcdRead(const char* path, const char* /*unused*/, char* con
 
 void StaticAcdRead::read_line(const char* path, int number, std::string_view line) {
   line = without_comment(line);
-  const std::string_view content = trimmed(line);
+  const std::string_view content = la_trimmed(line);
   if (content.empty()) return;
   const bool continues = content.data() != line.data();
   const std::size_t equals = line.find('=');
-  const std::string_view key = trimmed(line.substr(0, equals));
+  const std::string_view key = la_trimmed(line.substr(0, equals));
   if (line.find('\0') != line.npos || (continues && last_value_ == nullptr) ||
       (!continues && (equals == line.npos || key.empty()))) {
     message().issueError("Launcher: \"%s\", line %d: Expecting KEY = VALUE\n", path, number);
@@ -89,7 +80,7 @@ void StaticAcdRead::read_line(const char* path, int number, std::string_view lin
     keys_.push_back(key);
     last_value_ = &values_.emplace_back();
   }
-  *last_value_ = trimmed(line.substr(equals + 1));
+  *last_value_ = la_trimmed(line.substr(equals + 1));
 }
 
 /// A line end and a blank lie between the two, and make room for the blank between the pieces.
@@ -103,21 +94,20 @@ std::string_view StaticAcdRead::joined(std::string_view value, std::string_view 
 
 std::string_view StaticAcdRead::value(std::string_view key) const {
   const int number = index_.find(la_hash(key), is_key(key));
-  return number != la_hash_index::NONE ? values_[static_cast<std::size_t>(number)]
-                                       : std::string_view();
+  return number != la_hash_index::NONE ? la_at(values_, number) : std::string_view();
 }
 
-std::string_view StaticAcdRead::take_piece(std::string_view& text, std::string_view separator) {
+std::string_view StaticAcdRead::take_piece(std::string_view& text, char separator) {
   const std::size_t end = text.find(separator);
-  const std::string_view piece = trimmed(text.substr(0, end));
-  text = end == text.npos ? std::string_view() : text.substr(end + separator.size());
+  const std::string_view piece = la_trimmed(text.substr(0, end));
+  text = end == text.npos ? std::string_view() : text.substr(end + 1);
   return piece;
 }
 
 Port::StringBase<char> StaticAcdRead::GetStringByKey(const char* key, const char* separator,
                                                      short index, const char* separator2,
                                                      short index2) const {
-  std::string_view text = piece_at(value(key), separator, index);
-  if (separator2 != nullptr) text = piece_at(text, separator2, index2);
+  std::string_view text = piece_at(value(key), *separator, index);
+  if (separator2 != nullptr) text = piece_at(text, *separator2, index2);
   return Port::StringBase<char>(std::string(text));
 }

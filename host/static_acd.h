@@ -24,9 +24,9 @@ class StaticAcdRead {
   StaticAcdRead(const StaticAcdRead&) = delete;
   StaticAcdRead& operator=(const StaticAcdRead&) = delete;
 
-  /// The value of key, split at separator, field number index (from 0); when separator2 is not
-  /// null, that field split at separator2, part number index2. An empty string when the key, the
-  /// field or the part does not exist.
+  /// The value of key, split at separator, one character, field number index (from 0); when
+  /// separator2 is not null, that field split at separator2, part number index2. An empty string
+  /// when the key, the field or the part does not exist.
   Port::StringBase<char> GetStringByKey(const char* key, const char* separator, short index,
                                         const char* separator2, short index2) const;
 
@@ -34,7 +34,7 @@ class StaticAcdRead {
   /// not exist, which is good as long as this object.
   std::string_view value(std::string_view key) const;
   /// Takes the first field from the front of such a text, which is null after the last one.
-  static std::string_view take_piece(std::string_view& text, std::string_view separator);
+  static std::string_view take_piece(std::string_view& text, char separator);
   /// All keys, in the order of the file; good as long as this object.
   const std::vector<std::string_view>& keys() const { return keys_; }
   /// False when something of the file could not be read or understood.
@@ -43,7 +43,7 @@ class StaticAcdRead {
  private:
   void read_line(const char* path, int number, std::string_view line);
   auto is_key(std::string_view key) const {
-    return [this, key](int number) { return keys_[static_cast<std::size_t>(number)] == key; };
+    return [this, key](int number) { return la_at(keys_, number) == key; };
   }
   std::string_view joined(std::string_view value, std::string_view content);
 

@@ -55,6 +55,8 @@ class UT_DARRAY : public UT_BASE_ARRAY {
   virtual void a_resetnum(int count);
   /// Index of the first element that is this pointer, or -1.
   virtual int intgetindex(void* element);
+  /// Whether another element fits in the storage as it is.
+  bool has_room() const { return static_cast<std::uint64_t>(count) < capacity_; }
   /// A copy of the storage, made with array new; the caller releases it.
   virtual void* a_makearray();
 
@@ -89,7 +91,13 @@ class UT_TYPED_DARRAY : public UT_DARRAY {
   using UT_DARRAY::a_resetnum;
 
   /// Adds an element at the end.
-  void append(Element element) { *static_cast<Element*>(getaddr(count)) = element; }
+  void append(Element element) {
+    if (has_room()) {
+      elements[count++] = element;
+    } else {
+      *static_cast<Element*>(getaddr(count)) = element;
+    }
+  }
   /// The elements in use, for a loop; good until the array grows.
   Element* begin() const { return elements; }
   Element* end() const { return elements + count; }

@@ -2,12 +2,11 @@
 
 #include <charconv>
 #include <cstring>
+#include <string_view>
+
+#include "host/blanks.h"
 
 namespace {
-
-constexpr bool is_blank(char c) {
-  return c == ' ' || c == '\t';
-}
 
 constexpr int lower(char c) {
   const auto byte = static_cast<unsigned char>(c);
@@ -15,7 +14,7 @@ constexpr int lower(char c) {
 }
 
 const char* skip_blanks(const char* s) {
-  while (is_blank(*s)) ++s;
+  while (la_is_blank(*s)) ++s;
   return s;
 }
 
@@ -37,10 +36,6 @@ char* UT_STR::Cat(char* dest, const char* src, std::size_t size) {
 char* UT_STR::Dup(const char* s) {
   const std::size_t size = Len(s) + 1;
   return static_cast<char*>(std::memcpy(new char[size], s, size));
-}
-
-std::size_t UT_STR::Len(const char* s) {
-  return std::strlen(s);
 }
 
 int UT_STR::Compare(const char* a, const char* b) {
@@ -79,11 +74,9 @@ char* UT_STR::RFindChar(char* s, int c) {
 }
 
 void UT_STR::Trim(char* s) {
-  const char* start = skip_blanks(s);
-  std::size_t length = Len(start);
-  while (length > 0 && is_blank(start[length - 1])) --length;
-  std::memmove(s, start, length);
-  s[length] = '\0';
+  const std::string_view trimmed = la_trimmed(s);
+  std::memmove(s, trimmed.data(), trimmed.size());
+  s[trimmed.size()] = '\0';
 }
 
 unsigned char UT_STR::AllBlank(const char* s) {
@@ -110,8 +103,12 @@ char UT_STR::GetToken(char* line, char* token, const char* delimiters) {
 }
 
 unsigned char UT_STR::StrToL(const char* s, long& value) {
-  if (s[0] == '+' && s[1] != '-') ++s;
-  const char* end = s + Len(s);
+  return StrToL(s, Len(s), value);
+}
+
+unsigned char UT_STR::StrToL(const char* s, std::size_t length, long& value) {
+  const char* end = s + length;
+  if (length > 1 && s[0] == '+' && s[1] != '-') ++s;
   long number = 0;
   const auto [stop, error] = std::from_chars(s, end, number);
   if (error != std::errc() || stop != end) return 0;
@@ -127,17 +124,19 @@ int UT_STR::IsAlpha(int c) {
   return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
 }
 
-la_text::la_text(const char* chars) {
+la_text::la_text(const char* chars, std::size_t length) {
   if (chars == nullptr) {
     room_[LAST] = ABSENT;
     return;
   }
-  const std::size_t size = UT_STR::Len(chars) + 1;
-  room_[LAST] = size <= SIZE ? IN_PLACE : ELSEWHERE;
-  if (size <= SIZE) {
-    std::memcpy(room_, chars, size);
+  char* to = room_;
+  if (length < SIZE) {
+    room_[LAST] = IN_PLACE;
   } else {
-    const char* copy = UT_STR::Dup(chars);
-    std::memcpy(room_, &copy, sizeof copy);
+    to = new char[length + 1];
+    std::memcpy(room_, &to, sizeof to);
+    room_[LAST] = ELSEWHERE;
   }
+  std::memcpy(to, chars, length);
+  to[length] = '\0';
 }

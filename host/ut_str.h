@@ -22,7 +22,7 @@ class UT_STR {
   /// A new copy of s, made with array new; the caller releases it with array delete.
   static char* Dup(const char* s);
   /// Number of characters before the terminator.
-  static std::size_t Len(const char* s);
+  static std::size_t Len(const char* s) { return std::strlen(s); }
 
   /// The comparisons return 0 for equal, else a value below or above 0 for the order of a and b.
   /// Those with an N look at the first n characters at most, those with an I ignore the case of
@@ -46,9 +46,10 @@ class UT_STR {
   /// delimiter a tab is one too, and counts as a space. token holds at least as much as line.
   /// Returns the delimiter that ended the token, or 0 when none did and line is now empty.
   static char GetToken(char* line, char* token, const char* delimiters);
-  /// Reads s as a whole as a decimal integer, possibly signed. Returns 0, and leaves value alone,
-  /// when s is anything else or the number does not fit.
+  /// Reads s, or so many characters of it, as a whole as a decimal integer, possibly signed.
+  /// Returns 0, and leaves value alone, when that is anything else or the number does not fit.
   static unsigned char StrToL(const char* s, long& value);
+  static unsigned char StrToL(const char* s, std::size_t length, long& value);
   /// Turns letters into lower case, in place.
   static void Lower(char* s);
   /// Non-zero for a letter.
@@ -60,7 +61,9 @@ class la_text {
  public:
   la_text() noexcept { room_[LAST] = ABSENT; }
   /// A copy of chars; null makes an absent text.
-  la_text(const char* chars);
+  la_text(const char* chars) : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0) {}
+  /// A copy of so many of chars; null makes an absent text.
+  la_text(const char* chars, std::size_t length);
   la_text(const la_text& other) : la_text(other.get()) {}
   la_text(la_text&& other) noexcept { take(other); }
   la_text& operator=(const la_text& other) { return *this = la_text(other); }

@@ -332,64 +332,57 @@ unsigned char LA_LAUNCHER::find_in_searchpaths(lookup& where, const char* ext, f
 /// spelling of the extension is another file.
 short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* visited,
                               found_file& source, DARRAY_LA_RULE_CONST_PTR& chain) {
-  /// The producers of one extension, and which of them is being tried.
-  struct level {
-    const std::vector<int>* producers;
-    std::size_t tried;
-
-    int rule() const { return (*producers)[tried]; }
-  };
-  const auto producers_of = [this](int extension) { return &index->producers(extension); };
-  std::vector<level> path;
+  // On each level the rule that is being tried; NONE after the last that produces what is needed.
+  std::vector<int> path;
   path.reserve(8);  // Few chains are longer.
-  path.push_back({producers_of(index->extension(wanted)), 0});
+  path.push_back(index->first_producer(wanted));
   std::vector<bool> failed(index->num_spellings());
+  const auto try_next = [&path, this] { path.back() = index->next_producer(path.back()); };
+  const auto has_failed = [&failed, this](int rule) {
+    return failed[static_cast<std::size_t>(index->spelling(rule))];
+  };
 
-  while (path.back().tried < path.back().producers->size() || path.size() > 1) {
+  while (path.back() != la_rule_index::NONE || path.size() > 1) {
     if (is_interrupted(where.given)) return LA_FAILED;
-    if (path.back().tried == path.back().producers->size()) {
+    if (path.back() == la_rule_index::NONE) {
       // No rule produces the input of the rule one level up: perhaps it is there.
       path.pop_back();
-      const int needing = path.back().rule();
+      const int needing = path.back();
       visited[needing] = 0;
       if (find_input(where, *rules->rules.elements[needing], source)) {
         for (auto used = path.rbegin(); used != path.rend(); ++used) {
-          visited[used->rule()] = 0;
-          chain.append(rules->rules.elements[used->rule()]);
+          visited[*used] = 0;
+          chain.append(rules->rules.elements[*used]);
         }
-        for (level& used : path) {
-          note(used.rule(), LA_EXPLANATION::TAKEN);
-          while (++used.tried < used.producers->size())
-            note(used.rule(), LA_EXPLANATION::NOT_NEEDED);
-        }
+        for (const int used : path) note_taken(used);
         return LA_FOUND;
       }
       note(needing, named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED : LA_EXPLANATION::NO_SOURCE);
-      failed[index->spelling(needing)] = true;
-      ++path.back().tried;
+      has_failed(needing) = true;
+      try_next();
       continue;
     }
-    const int i = path.back().rule();
+    const int i = path.back();
     const LA_RULE& rule = *rules->rules.elements[i];
     if (visited[i]) {
       report_loop(visited);
-      for (const level& used : path) {
-        if (visited[used.rule()]) note(used.rule(), LA_EXPLANATION::IN_A_LOOP);
-        visited[used.rule()] = 0;
+      for (const int used : path) {
+        if (visited[used]) note(used, LA_EXPLANATION::IN_A_LOOP);
+        visited[used] = 0;
       }
       return LA_FAILED;
     }
     const char* only_name = rule.netlist_file->get_name();
     const bool for_another = only_name != nullptr && !where.given.match_name(only_name);
-    if (for_another || failed[index->spelling(i)]) {
+    if (for_another || has_failed(i)) {
       note(i, for_another   ? LA_EXPLANATION::FOR_ANOTHER_NAME
               : named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED
                             : LA_EXPLANATION::NO_SOURCE);
-      ++path.back().tried;
+      try_next();
       continue;
     }
     visited[i] = 1;
-    path.push_back({producers_of(index->needed(i)), 0});
+    path.push_back(index->first_producer_for(i));
   }
   return LA_NOT_FOUND;
 }
@@ -397,6 +390,15 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
 /// Adds a rule that was considered to the explanation.
 void LA_LAUNCHER::note(int rule, LA_EXPLANATION::VERDICT verdict) const {
   if (explanation != nullptr) explanation->rules.push_back({rules->rules.elements[rule], verdict});
+}
+
+/// Adds a rule of the chain, and those that need not be considered any more.
+void LA_LAUNCHER::note_taken(int rule) const {
+  if (explanation == nullptr) return;
+  note(rule, LA_EXPLANATION::TAKEN);
+  while ((rule = index->next_producer(rule)) != la_rule_index::NONE) {
+    note(rule, LA_EXPLANATION::NOT_NEEDED);
+  }
 }
 
 /// Looks for the file that a rule reads. Where the user named a file, it is that or none.

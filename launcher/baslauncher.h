@@ -120,6 +120,7 @@ class LA_LAUNCHER {
   short plan_chain(lookup& where, const char* wanted, unsigned char* visited, found_file& source,
                    DARRAY_LA_RULE_CONST_PTR& chain);
   void note(int rule, LA_EXPLANATION::VERDICT verdict) const;
+  void note_taken(int rule) const;
   bool find_input(lookup& where, const LA_RULE& rule, found_file& source);
   void report_loop(const unsigned char* visited);
 

@@ -2,69 +2,89 @@
 #ifndef KESTREL_LAUNCHER_RULE_INDEX_H
 #define KESTREL_LAUNCHER_RULE_INDEX_H
 
-#include <string>
-#include <unordered_map>
+#include <cstring>
+#include <utility>
 #include <vector>
 
+#include "host/hash_index.h"
 #include "rules/baslarules.h"
 
-/// Numbers the extensions that the rules name, ignoring the case of letters, and knows for each
-/// which rules produce it. As files are looked for as they are spelt, it numbers the spellings of
-/// the extensions that rules need, too.
+/// Knows which rules of a set produce files of an extension, whose letters' case does not count. As
+/// files are looked for as they are spelt, it numbers the spellings of the extensions, too. Rules
+/// are numbers in the order of the set, which must outlive this object.
 class la_rule_index {
  public:
-  explicit la_rule_index(const DARRAY_LA_RULE_PTR& rules) : producers_(1) {
-    for (int i = 0; i < rules.count; ++i) {
+  static constexpr int NONE = -1;
+
+  explicit la_rule_index(const DARRAY_LA_RULE_PTR& rules)
+      : rules_(static_cast<std::size_t>(rules.count)) {
+    for (int i = rules.count - 1; i >= 0; --i) {
       const LA_RULE& rule = *rules.elements[i];
       // In a set that is not valid a rule may lack its files: it can then not be used.
       const bool usable = rule.netlist_file && rule.target;
-      const char* needed = usable ? rule.netlist_file->get_ext() : nullptr;
-      needed_.push_back(add(needed));
-      const auto spelling =
-          spellings_.try_emplace(needed != nullptr ? needed : "", spellings_.size());
-      spelling_.push_back(spelling.first->second);
+      la_at(rules_, i).needed = add(usable ? rule.netlist_file->get_ext() : nullptr);
       const int made = add(usable ? rule.target->get_ext() : nullptr);
-      if (made != NO_EXTENSION) producers_[static_cast<std::size_t>(made)].push_back(i);
+      if (made == NO_EXTENSION) continue;
+      int& first = la_at(first_producers_, la_at(spellings_, made).extension);
+      la_at(rules_, i).next_producer = std::exchange(first, i);
     }
   }
 
-  /// The number of an extension; NO_EXTENSION for null and for one that no rule names.
-  int extension(const char* ext) const {
-    const auto found = ext != nullptr ? numbers_.find(key(ext)) : numbers_.end();
-    return found != numbers_.end() ? found->second : NO_EXTENSION;
+  /// The first rule whose target has this extension, or NONE.
+  int first_producer(const char* ext) const {
+    const int extension =
+        extensions_.find(la_hash(ext), [&](int number) { return is_extension(number, ext); });
+    return extension != NONE ? la_at(first_producers_, extension) : NONE;
   }
-  /// The extension of the rule's netlist file.
-  int needed(int rule) const { return needed_[static_cast<std::size_t>(rule)]; }
-  /// The spelling of that extension, from 0 to num_spellings() - 1.
-  std::size_t spelling(int rule) const { return spelling_[static_cast<std::size_t>(rule)]; }
+  /// The first rule that produces files of the extension that the rule needs, or NONE.
+  int first_producer_for(int rule) const {
+    return la_at(first_producers_, la_at(spellings_, spelling(rule)).extension);
+  }
+  /// The next rule whose target has the same extension as that of the rule, or NONE.
+  int next_producer(int rule) const { return la_at(rules_, rule).next_producer; }
+  /// The spelling of the extension that the rule needs, from 0 to num_spellings() - 1.
+  int spelling(int rule) const { return la_at(rules_, rule).needed; }
   std::size_t num_spellings() const { return spellings_.size(); }
-  /// The rules whose target has this extension, in the order of the set.
-  const std::vector<int>& producers(int extension) const {
-    return producers_[static_cast<std::size_t>(extension)];
-  }
 
  private:
+  struct rule_entry {
+    int needed = NO_EXTENSION;  ///< as it is spelt
+    int next_producer = NONE;
+  };
+  struct spelling_entry {
+    const char* text;
+    int extension;
+  };
   /// Nothing produces a file of no extension.
   static constexpr int NO_EXTENSION = 0;
 
-  static std::string key(const char* ext) {
-    std::string lower(ext);
-    UT_STR::Lower(lower.data());
-    return lower;
+  bool is_extension(int number, const char* ext) const {
+    return UT_STR::ICompare(la_at(extension_texts_, number), ext) == 0;
   }
+  /// The number of a spelling, which is added if it is new.
   int add(const char* ext) {
     if (ext == nullptr) return NO_EXTENSION;
-    const auto [place, is_new] =
-        numbers_.try_emplace(key(ext), static_cast<int>(producers_.size()));
-    if (is_new) producers_.emplace_back();
-    return place->second;
+    const std::uint32_t hash = la_hash(ext);
+    int& spelt = by_spelling_.place(
+        hash, [&](int number) { return std::strcmp(la_at(spellings_, number).text, ext) == 0; });
+    if (spelt != NONE) return spelt;
+    spelt = static_cast<int>(spellings_.size());
+    int& extension = extensions_.place(hash, [&](int number) { return is_extension(number, ext); });
+    if (extension == NONE) {
+      extension = static_cast<int>(first_producers_.size());
+      extension_texts_.push_back(ext);
+      first_producers_.push_back(NONE);
+    }
+    spellings_.push_back({ext, extension});
+    return spelt;
   }
 
-  std::unordered_map<std::string, int> numbers_;
-  std::vector<std::vector<int>> producers_;
-  std::vector<int> needed_;
-  std::unordered_map<std::string, std::size_t> spellings_;
-  std::vector<std::size_t> spelling_;
+  std::vector<rule_entry> rules_;
+  std::vector<spelling_entry> spellings_ = {{"", NO_EXTENSION}};
+  std::vector<const char*> extension_texts_ = {""};
+  std::vector<int> first_producers_ = {NONE};  ///< by extension
+  la_hash_index by_spelling_;
+  la_hash_index extensions_;
 };
 
 #endif

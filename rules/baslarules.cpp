@@ -6,6 +6,7 @@
 #include <string_view>
 #include <vector>
 
+#include "host/blanks.h"
 #include "host/hash_index.h"
 #include "host/pm_devkey.h"
 #include "host/pm_pic.h"
@@ -76,24 +77,29 @@ void LA_STATUS::dump() const {
   message().issueStatus("%s status %s %d\n", level_word(level), SYMBOLS[op], code);
 }
 
+LA_STATUS* LA_STATUS_STORE::keep(const LA_STATUS& entry) {
+  for (std::optional<LA_STATUS>& place : few) {
+    if (!place) return &place.emplace(entry);
+  }
+  return &more.emplace_front(entry);
+}
+
 bool parse_status(const char* text, unsigned short& op, int& code) {
   op = OP_NOVALUE;
   code = 0;
-  char value[LA_MAX_PATH];
-  if (text == nullptr || UT_STR::Copy(value, text) == nullptr) return false;
-  UT_STR::Trim(value);
-
+  if (text == nullptr || UT_STR::Len(text) >= LA_MAX_PATH) return false;
+  std::string_view value = la_trimmed(text);
   op = OP_EQ;
-  const char* digits = value;
   for (unsigned short i = 0; i < WRITTEN_OPERATORS; ++i) {
-    if (*digits != SYMBOLS[i][0]) continue;
+    if (!value.starts_with(SYMBOLS[i][0])) continue;
     op = i;
-    ++digits;
-    while (*digits == ' ') ++digits;
+    value.remove_prefix(1);
+    while (value.starts_with(' ')) value.remove_prefix(1);
     break;
   }
   long number = 0;
-  if (!UT_STR::StrToL(digits, number) || number < INT_MIN || number > INT_MAX) return false;
+  if (!UT_STR::StrToL(value.data(), value.size(), number) || number < INT_MIN || number > INT_MAX)
+    return false;
   code = static_cast<int>(number);
   return true;
 }
@@ -120,16 +126,15 @@ void set_dir(unsigned short& flag, std::unique_ptr<LA_DIR>& dir, const char* tex
   dir = std::make_unique<LA_DIR>(text);
 }
 
-bool add_status(DARRAY_LA_STATUS_PTR& list, unsigned short level, const char* text) {
-  unsigned short op = OP_NOVALUE;
-  int code = 0;
+/// The entry that a text of a status field means; none when it is not valid.
+std::optional<LA_STATUS> status_of(unsigned short level, const char* text) {
+  LA_STATUS entry(level, OP_NOVALUE, 0);
   if (text != nullptr && is_none(text)) {
-    op = OP_NONE;
-  } else if (text != nullptr && !parse_status(text, op, code)) {
-    return false;
+    entry.op = OP_NONE;
+  } else if (text != nullptr && !parse_status(text, entry.op, entry.code)) {
+    return {};
   }
-  list.append(new LA_STATUS(level, op, code));
-  return true;
+  return entry;
 }
 
 unsigned short result(const DARRAY_LA_STATUS_PTR& list, int exit_code) {
@@ -139,11 +144,16 @@ unsigned short result(const DARRAY_LA_STATUS_PTR& list, int exit_code) {
   return LA_FATAL;
 }
 
+LA_FILE* set_file(std::optional<LA_FILE>& file, const char* text) {
+  file.reset();
+  return text != nullptr ? &file.emplace(text) : nullptr;
+}
+
 const char* name_of(const std::unique_ptr<LA_DIR>& dir) {
   return dir ? dir->get_dir() : nullptr;
 }
 
-const char* name_of(const std::unique_ptr<LA_FILE>& file) {
+const char* name_of(const std::optional<LA_FILE>& file) {
   return file ? file->get_file() : nullptr;
 }
 
@@ -156,18 +166,14 @@ LA_RULE::~LA_RULE() {
   if (dependency_files) {
     for (LA_FILE* file : *dependency_files) delete file;
   }
-  for (LA_STATUS* entry : netlister_status) delete entry;
-  for (LA_STATUS* entry : checker_status) delete entry;
 }
 
 LA_FILE* LA_RULE::set_netlist_file(const char* text) {
-  netlist_file.reset(text != nullptr ? new LA_FILE(text) : nullptr);
-  return netlist_file.get();
+  return set_file(netlist_file, text);
 }
 
 LA_FILE* LA_RULE::set_target(const char* text) {
-  target.reset(text != nullptr ? new LA_FILE(text) : nullptr);
-  return target.get();
+  return set_file(target, text);
 }
 
 void LA_RULE::add_dependency_file(const char* text) {
@@ -209,19 +215,23 @@ void LA_RULE::set_checker_dir(const char* text) {
 }
 
 void LA_RULE::add_netlister_status(const LA_STATUS& entry) {
-  netlister_status.append(new LA_STATUS(entry));
+  netlister_status.append(statuses.keep(entry));
 }
 
 void LA_RULE::add_checker_status(const LA_STATUS& entry) {
-  checker_status.append(new LA_STATUS(entry));
+  checker_status.append(statuses.keep(entry));
 }
 
 bool LA_RULE::add_netlister_status(unsigned short level, const char* text) {
-  return add_status(netlister_status, level, text);
+  const std::optional<LA_STATUS> entry = status_of(level, text);
+  if (entry) add_netlister_status(*entry);
+  return entry.has_value();
 }
 
 bool LA_RULE::add_checker_status(unsigned short level, const char* text) {
-  return add_status(checker_status, level, text);
+  const std::optional<LA_STATUS> entry = status_of(level, text);
+  if (entry) add_checker_status(*entry);
+  return entry.has_value();
 }
 
 unsigned short LA_RULE::netlister_result(int exit_code) const {
@@ -273,7 +283,7 @@ void fill_for_check(LA_KEYWORD_TABLE& table) {
   for (const auto& known : VALUES) table.set_keyword(known.keyword, known.value);
 }
 
-bool names_a_file(const std::unique_ptr<LA_FILE>& file) {
+bool names_a_file(const std::optional<LA_FILE>& file) {
   if (!file) return false;
   return file->get_ext() != nullptr || (file->get_name() != nullptr && !is_none(file->get_name()));
 }
@@ -331,15 +341,14 @@ bool check_redefinitions(const DARRAY_LA_RULE_PTR& batch) {
     // A target without extension matches none.
     if (rule.target->get_ext() == nullptr) continue;
     const char* name = rule.netlist_file->get_name();
-    int& same = last.place(la_hash(name != nullptr ? name : "", hash_of_extensions(rule)),
+    int& same = last.place(la_hash(name, hash_of_extensions(rule)),
                            [&](int other) { return redefines(rule, *batch.elements[other]); });
-    if (same != la_hash_index::NONE) next[static_cast<std::size_t>(same)] = i;
+    if (same != la_hash_index::NONE) la_at(next, same) = i;
     same = i;
   }
   bool good = true;
   for (int a = 0; a < batch.count; ++a) {
-    for (int b = next[static_cast<std::size_t>(a)]; b < batch.count;
-         b = next[static_cast<std::size_t>(b)]) {
+    for (int b = la_at(next, a); b < batch.count; b = la_at(next, b)) {
       message().issueError("Launcher: Rule %s redefines rule %s\n",
                            batch.elements[a]->rule_name.get(), batch.elements[b]->rule_name.get());
       good = false;
@@ -613,7 +622,7 @@ class system_rules_loader {
   bool read() {
     std::string_view names = reader_.value("RULES");
     for (int i = 0;; ++i) {
-      const std::string name(StaticAcdRead::take_piece(names, ","));
+      const std::string name(StaticAcdRead::take_piece(names, ','));
       if (name.empty()) break;
       if (i == SHRT_MAX) {
         message().issueError("Launcher: Rule: %s - There are more than %d rules.\n", name.c_str(),
@@ -632,9 +641,10 @@ class system_rules_loader {
   void read_rule(const char* name) {
     auto rule = std::make_unique<LA_RULE>(name);
     if (UT_STR::Len(name) >= LA_MAX_PATH) refuse_length(name, "The name");
-    std::string_view record = reader_.value(name);
+    record_.assign(reader_.value(name));
+    std::string_view record = record_;
     for (std::size_t position = 0; position < NUM_FIELDS; ++position) {
-      read_field(*rule, position, StaticAcdRead::take_piece(record, ","));
+      read_field(*rule, position, StaticAcdRead::take_piece(record, ','));
       if (position == LAST_NETLISTER_STATUS && rule->netlister_status.count == 0) {
         report(703, name,
                "There must be at least one of the following: NetlisterSuccessStatus, "
@@ -646,7 +656,7 @@ class system_rules_loader {
              "There myst be at least one of the following: CheckerSuccessStatus, "
              "CheckerWarningStatus, or CheckerFatalStatus.");
     }
-    if (!StaticAcdRead::take_piece(record, ",").empty()) {
+    if (!StaticAcdRead::take_piece(record, ',').empty()) {
       message().issueWarning("Launcher: Rule: %s - Only the first %d fields are used.\n", name,
                              static_cast<int>(NUM_FIELDS));
     }
@@ -656,27 +666,26 @@ class system_rules_loader {
   void read_field(LA_RULE& rule, std::size_t position, std::string_view given) {
     const rule_field& known = FIELDS[position];
     const char* name = rule.rule_name;
-    char text[LA_MAX_PATH];
     if (given.empty() || is_same(given, "NONE")) {
       if (known.required) report(known.line, name, std::string(known.keyword) + " is required.");
     } else if (position == DEPENDENCY_FILES) {
       read_dependency_files(rule, given);
-    } else if (!fits(given, text)) {
+    } else if (given.size() >= LA_MAX_PATH) {
       refuse_length(name, known.keyword.data());
-    } else if (!known.store(rule, text)) {
+    } else if (!known.store(rule, terminated(given))) {
       report(known.line, name, "Invalid exit code for " + std::string(known.keyword) + ".");
     }
   }
 
   void read_dependency_files(LA_RULE& rule, std::string_view files) {
-    char text[LA_MAX_PATH];
     for (int i = 0; i <= SHRT_MAX; ++i) {
-      const std::string_view part = StaticAcdRead::take_piece(files, "|");
+      const std::string_view part = StaticAcdRead::take_piece(files, '|');
       if (part.empty()) return;
-      if (!fits(part, text)) {
+      if (part.size() >= LA_MAX_PATH) {
         refuse_length(rule.rule_name, "Dependency file");
         continue;
       }
+      const char* text = terminated(part);
       const LA_FILE file(text);
       if (file.get_tail() == nullptr || file.get_head() != nullptr) {
         message().issueWarning(
@@ -688,11 +697,11 @@ class system_rules_loader {
     report(__LINE__, rule.rule_name, "There are too many dependency files.");
   }
 
-  /// Copies text into a buffer, with a terminator. False when it does not fit.
-  static bool fits(std::string_view text, char (&buffer)[LA_MAX_PATH]) {
-    if (text.size() >= sizeof buffer) return false;
-    buffer[text.copy(buffer, text.size())] = '\0';
-    return true;
+  /// Puts a terminator behind a piece of the record, in the place of a separator or blank that has
+  /// been read.
+  const char* terminated(std::string_view piece) {
+    record_[static_cast<std::size_t>(piece.data() - record_.data()) + piece.size()] = '\0';
+    return piece.data();
   }
 
   void refuse_length(const char* rule_name, const char* what, int line = __builtin_LINE()) {
@@ -707,6 +716,7 @@ class system_rules_loader {
   }
 
   StaticAcdRead reader_;
+  std::string record_;  ///< of the current rule, to be cut into its fields
   bool good_ = true;
   rule_batch batch_;
 };

@@ -3,7 +3,10 @@
 #ifndef KESTREL_RULES_BASLARULES_H
 #define KESTREL_RULES_BASLARULES_H
 
+#include <array>
+#include <forward_list>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -52,6 +55,17 @@ class LA_STATUS {
 /// Reads a status value: an optional operator, blanks, a decimal number. Returns false, with
 /// code 0, for anything else (null included, which gives OP_NOVALUE).
 bool parse_status(const char* text, unsigned short& op, int& code);
+
+/// Keeps the entries of a rule: the first few, which is all that most rules have, in place.
+class LA_STATUS_STORE {
+ public:
+  /// A copy of entry, good as long as this object.
+  LA_STATUS* keep(const LA_STATUS& entry);
+
+ private:
+  std::array<std::optional<LA_STATUS>, 3> few;
+  std::forward_list<LA_STATUS> more;
+};
 
 using DARRAY_LA_STATUS_PTR = UT_TYPED_DARRAY<LA_STATUS*>;
 using DARRAY_LA_FILE_PTR = UT_TYPED_DARRAY<LA_FILE*>;
@@ -107,8 +121,8 @@ class LA_RULE {
   void dump(bool detail) const;
 
   la_text rule_name;
-  std::unique_ptr<LA_FILE> netlist_file;  ///< the sources that the rule applies to
-  std::unique_ptr<LA_FILE> target;        ///< only its extension counts
+  std::optional<LA_FILE> netlist_file;  ///< the sources that the rule applies to
+  std::optional<LA_FILE> target;        ///< only its extension counts
   std::unique_ptr<DARRAY_LA_FILE_PTR> dependency_files;
   la_text netlister;
   la_text netlister_top_options;
@@ -121,6 +135,9 @@ class LA_RULE {
   std::unique_ptr<LA_DIR> checker_dir;
   DARRAY_LA_STATUS_PTR netlister_status;
   DARRAY_LA_STATUS_PTR checker_status;
+
+ private:
+  LA_STATUS_STORE statuses;
 };
 
 using DARRAY_LA_RULE_PTR = UT_TYPED_DARRAY<LA_RULE*>;

@@ -14,13 +14,12 @@ constexpr la_text LA_RULE::*CLEARED_TEXTS[] = {&LA_RULE::netlister_top_options,
                                                &LA_RULE::netlister_options, &LA_RULE::checker,
                                                &LA_RULE::checker_options};
 
-/// Adds, of each level that the list lacks, the first entry of the other list.
-void complete(DARRAY_LA_STATUS_PTR& list, const DARRAY_LA_STATUS_PTR& from) {
-  for (const LA_STATUS* entry : from) {
-    const bool has_level = std::any_of(list.begin(), list.end(), [entry](const LA_STATUS* own) {
-      return own->level == entry->level;
-    });
-    if (!has_level) list.append(new LA_STATUS(*entry));
+/// Adds, of each level that the rule's list lacks, the first entry of the other list.
+template <DARRAY_LA_STATUS_PTR LA_RULE::*list, void (LA_RULE::*add)(const LA_STATUS&)>
+void complete_statuses(LA_RULE& rule, const LA_RULE& from) {
+  for (const LA_STATUS* entry : from.*list) {
+    const auto has_level = [entry](const LA_STATUS* own) { return own->level == entry->level; };
+    if (std::none_of((rule.*list).begin(), (rule.*list).end(), has_level)) (rule.*add)(*entry);
   }
 }
 
@@ -38,8 +37,8 @@ void complete(LA_RULE& rule, const LA_RULE& from) {
   if (rule.checker_dir_flag == DIR_UNSET && from.checker_dir_flag != DIR_UNSET) {
     rule.set_checker_dir(from.checker_dir.get(), from.checker_dir_flag);
   }
-  complete(rule.netlister_status, from.netlister_status);
-  complete(rule.checker_status, from.checker_status);
+  complete_statuses<&LA_RULE::netlister_status, &LA_RULE::add_netlister_status>(rule, from);
+  complete_statuses<&LA_RULE::checker_status, &LA_RULE::add_checker_status>(rule, from);
 }
 
 void clear_none(LA_RULE& rule) {
@@ -53,7 +52,7 @@ void clear_none(LA_RULE& rule) {
 std::uint32_t hash_of_extensions(const LA_RULE& rule) {
   const char* from = rule.netlist_file->get_ext();
   const char* to = rule.target->get_ext();
-  return la_hash(to != nullptr ? to : "", la_hash(from != nullptr ? from : ""));
+  return la_hash(to, la_hash(from));
 }
 
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
