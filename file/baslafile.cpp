@@ -66,6 +66,7 @@ class la_path_text {
   std::size_t length() const { return length_; }
   char* chars() { return chars_; }
   const char* chars() const { return chars_; }
+  std::string_view view() const { return {chars_, length_}; }
 
   /// Takes so many slots of the ring and returns the text, in external form, in the last of them.
   /// A text that does not fit takes none and gives null.
@@ -132,13 +133,15 @@ bool la_split_dir(la_path_text& text, path_parts& parts) {
   return text.fits();
 }
 
+la_text la_text_of(std::string_view text) {
+  return text.empty() ? la_text() : la_text(text.data(), text.size());
+}
+
 /// Splits a file name without directory at its last dot.
-void la_split_tail(char* tail, path_parts& parts) {
-  if (char* dot = UT_STR::RFindChar(tail, '.')) {
-    *dot = '\0';
-    if (dot[1] != '\0') parts.ext = dot + 1;
-  }
-  if (*tail != '\0') parts.name = tail;
+void la_split_tail(std::string_view tail, path_parts& parts) {
+  const std::size_t dot = tail.rfind('.');
+  if (dot != tail.npos) parts.ext = la_text_of(tail.substr(dot + 1));
+  parts.name = la_text_of(tail.substr(0, dot));
 }
 
 /// Splits a path into its parts. False for null, an empty path, one that does not fit, and one
@@ -147,11 +150,10 @@ bool la_split_path(const char* path, path_parts& parts) {
   if (path == nullptr || *path == '\0') return false;
   la_path_text text(path);
   if (!text.fits()) return false;
-  char* const slash = UT_STR::RFindChar(text.chars(), '/');
-  char* const tail = slash != nullptr ? slash + 1 : text.chars();
-  la_split_tail(tail, parts);
-  if (slash == nullptr) return true;
-  text.cut(static_cast<std::size_t>(tail - text.chars()));
+  const std::size_t tail = text.view().rfind('/') + 1;
+  la_split_tail(text.view().substr(tail), parts);
+  if (tail == 0) return true;
+  text.cut(tail);
   return la_split_dir(text, parts);
 }
 
@@ -178,7 +180,7 @@ bool resolve_dots(const la_path_text& from, la_path_text& to) {
 
 /// Brings a full name into its normal form, where there is one.
 void normalise(la_path_text& text) {
-  const std::string_view chars(text.chars(), text.length());
+  const std::string_view chars = text.view();
   if (chars.find("./") == chars.npos && chars.find('\\') == chars.npos) return;
   la_path_text normal;
   if (text.fits() && resolve_dots(la_path_text(text.chars()), normal)) text = normal;
@@ -259,7 +261,9 @@ LA_FILE::LA_FILE(la_text head, la_text name, la_text ext)
 unsigned char LA_FILE::set_file(const char* path) {
   path_parts parts;
   if (!la_split_path(path, parts) || parts.is_absolute()) parts = path_parts();
-  *this = LA_FILE(std::move(parts.dir), std::move(parts.name), std::move(parts.ext));
+  head = std::move(parts.dir);
+  name = std::move(parts.name);
+  ext = std::move(parts.ext);
   return names_file();
 }
 
@@ -290,7 +294,7 @@ unsigned char LA_FILE::set_tail(const char* tail) {
   if (tail != nullptr) {
     la_path_text text(tail);
     if (text.fits()) {
-      la_split_tail(text.chars(), parts);
+      la_split_tail(text.view(), parts);
     } else {
       head = la_text();
     }

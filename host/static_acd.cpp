@@ -4,7 +4,6 @@
 #include <cstring>
 #include <memory>
 
-#include "host/blanks.h"
 #include "host/port_file.h"
 #include "host/port_msgman.h"
 
@@ -47,7 +46,10 @@ StaticAcdRead::StaticAcdRead(const char* path, const char* /*unused*/, char* con
     const std::size_t end = text_.find('\n', start);
     std::string_view line = std::string_view(text_).substr(start, end - start);
     if (end != text_.npos && line.ends_with('\r')) line.remove_suffix(1);
-    read_line(path, number, line);
+    if (!read_line(line)) {
+      message().issueError("Launcher: \"%s\", line %d: Expecting KEY = VALUE\n", path, number);
+      valid_ = false;
+    }
     start = std::min(end, text_.size() - 1) + 1;
   }
   if (stream->failed()) {
@@ -56,23 +58,19 @@ StaticAcdRead::StaticAcdRead(const char* path, const char* /*unused*/, char* con
   }
 }
 
-void StaticAcdRead::read_line(const char* path, int number, std::string_view line) {
+bool StaticAcdRead::read_line(std::string_view line) {
   line = without_comment(line);
   const std::string_view content = la_trimmed(line);
-  if (content.empty()) return;
-  const bool continues = content.data() != line.data();
-  const std::size_t equals = line.find('=');
-  const std::string_view key = la_trimmed(line.substr(0, equals));
-  if (line.find('\0') != line.npos || (continues && last_value_ == nullptr) ||
-      (!continues && (equals == line.npos || key.empty()))) {
-    message().issueError("Launcher: \"%s\", line %d: Expecting KEY = VALUE\n", path, number);
-    valid_ = false;
-    return;
-  }
-  if (continues) {
+  if (content.empty()) return true;
+  if (content.find('\0') != content.npos) return false;
+  if (content.data() != line.data()) {
+    if (last_value_ == nullptr) return false;
     *last_value_ = joined(*last_value_, content);
-    return;
+    return true;
   }
+  const std::size_t equals = content.find('=');
+  const std::string_view key = la_trimmed(content.substr(0, equals));
+  if (equals == content.npos || key.empty()) return false;
   int& known = index_.place(la_hash(key), is_key(key));
   last_value_ = &passed_over_;
   if (known == la_hash_index::NONE) {
@@ -80,7 +78,8 @@ void StaticAcdRead::read_line(const char* path, int number, std::string_view lin
     keys_.push_back(key);
     last_value_ = &values_.emplace_back();
   }
-  *last_value_ = la_trimmed(line.substr(equals + 1));
+  *last_value_ = la_trimmed(content.substr(equals + 1));
+  return true;
 }
 
 /// A line end and a blank lie between the two, and make room for the blank between the pieces.
@@ -95,13 +94,6 @@ std::string_view StaticAcdRead::joined(std::string_view value, std::string_view 
 std::string_view StaticAcdRead::value(std::string_view key) const {
   const int number = index_.find(la_hash(key), is_key(key));
   return number != la_hash_index::NONE ? la_at(values_, number) : std::string_view();
-}
-
-std::string_view StaticAcdRead::take_piece(std::string_view& text, char separator) {
-  const std::size_t end = text.find(separator);
-  const std::string_view piece = la_trimmed(text.substr(0, end));
-  text = end == text.npos ? std::string_view() : text.substr(end + 1);
-  return piece;
 }
 
 Port::StringBase<char> StaticAcdRead::GetStringByKey(const char* key, const char* separator,

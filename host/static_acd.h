@@ -7,6 +7,7 @@
 #include <string_view>
 #include <vector>
 
+#include "host/blanks.h"
 #include "host/hash_index.h"
 #include "host/port_string.h"
 
@@ -34,14 +35,20 @@ class StaticAcdRead {
   /// not exist, which is good as long as this object.
   std::string_view value(std::string_view key) const;
   /// Takes the first field from the front of such a text, which is null after the last one.
-  static std::string_view take_piece(std::string_view& text, char separator);
+  static std::string_view take_piece(std::string_view& text, char separator) {
+    const std::size_t end = text.find(separator);
+    const std::string_view piece = la_trimmed(text.substr(0, end));
+    text = end == text.npos ? std::string_view() : text.substr(end + 1);
+    return piece;
+  }
   /// All keys, in the order of the file; good as long as this object.
   const std::vector<std::string_view>& keys() const { return keys_; }
   /// False when something of the file could not be read or understood.
   bool valid() const { return valid_; }
 
  private:
-  void read_line(const char* path, int number, std::string_view line);
+  /// False when the line is not of the form above; it is then passed over.
+  bool read_line(std::string_view line);
   auto is_key(std::string_view key) const {
     return [this, key](int number) { return la_at(keys_, number) == key; };
   }
