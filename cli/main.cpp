@@ -79,6 +79,7 @@ std::string complete(settings& set) {
 }
 
 void print_totals(bool ok, int errors, int warnings) {
+  console::flush();
   std::printf("{\"ok\":%s,\"errors\":%d,\"warnings\":%d}\n", ok ? "true" : "false", errors,
               warnings);
 }
@@ -224,6 +225,7 @@ int explain(settings& set) {
     char netlist[LA_MAX_PATH];
     error.clear();
     const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
+    console::flush();
     if (i > 0) std::puts("");
     std::fputs(explained({set.names[i], result, netlist, error}, why).c_str(), stdout);
     status = worse(status, result);
@@ -231,8 +233,10 @@ int explain(settings& set) {
   return status;
 }
 
-/// Says so when there are no rules at all: the data of the installation is probably not found.
-void expect_rules(const LA_RULE_SET& set) {
+/// Shows the findings on the rules, and says so when there are no rules at all: the data of the
+/// installation is probably not found.
+void show_findings(const LA_RULE_SET& set) {
+  console::flush();
   if (set.is_valid && set.rules.count == 0) {
     complain("there are no rules; do MYCORVANE and CORVANE name installation roots?");
   }
@@ -248,9 +252,10 @@ int check(const settings& set) {
   });
   const LA_RULE_SET rules(set.part, set.user_rules);
   reading.reset();
-  expect_rules(rules);
+  show_findings(rules);
   if (rules.is_valid) hints = hints_on(rules);
-  for (const std::string& hint : hints) complain("hint: " + hint);
+  for (std::string& hint : hints) hint.insert(0, "hint: ");
+  complain(hints);
   if (set.json) print_totals(rules.is_valid, 0, 0);
   if (!set.json && rules.is_valid) std::printf("Rules checked: %d, all good\n", rules.rules.count);
   return rules.is_valid ? ALL_FOUND : FAILED;
@@ -258,7 +263,7 @@ int check(const settings& set) {
 
 int list_rules(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
-  expect_rules(rules);
+  show_findings(rules);
   const diversion to_output([](const Port_Msg& message) {
     return message.level == PORT_MSG_STATUS && std::fputs(message.text, stdout) >= 0;
   });
@@ -268,13 +273,15 @@ int list_rules(const settings& set) {
 
 int draw_graph(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
-  expect_rules(rules);
+  show_findings(rules);
   if (rules.is_valid) std::fputs(graph_of(rules).c_str(), stdout);
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
 
 int list_parts() {
-  for (const std::string& part : PM_PIC::all_parts()) std::printf("%s\n", part.c_str());
+  const std::vector<std::string> parts = PM_PIC::all_parts();
+  console::flush();
+  for (const std::string& part : parts) std::printf("%s\n", part.c_str());
   return ALL_FOUND;
 }
 
