@@ -7,14 +7,14 @@
 //   graph      draws the rules
 //   signals    ends the netlister when the command is to end
 //   main       does what the command line asks for
+#include <fcntl.h>
 #include <signal.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
-#include <fstream>
-#include <iostream>
 #include <optional>
 #include <string>
 #include <vector>
@@ -38,30 +38,31 @@ enum exit_status { ALL_FOUND = 0, NOT_ALL_FOUND = 1, FAILED = 2 };
 
 /// Appends the names in a file, one per line. Returns an empty text, or what is wrong.
 std::string read_names(const std::string& file, std::vector<std::string>& names) {
-  std::ifstream opened;
-  const bool from_input = file == "-";
-  if (!from_input) opened.open(file);
-  std::istream& in = from_input ? std::cin : opened;
+  const int descriptor =
+      file == "-" ? ::dup(STDIN_FILENO) : ::open(file.c_str(), O_RDONLY | O_CLOEXEC);
+  if (descriptor < 0) return "--names-from: could not read " + file;
+  Port::Stream in(descriptor);
   char line[4096];
-  for (int number = 1; in.getline(line, sizeof line); ++number) {
-    std::string name(line, static_cast<std::size_t>(in.gcount()) - (in.eof() ? 0 : 1));
-    if (name.ends_with('\r')) name.pop_back();
-    if (name.find('\0') != name.npos) {
+  for (int number = 1; !in.geteof(); ++number) {
+    const auto length = static_cast<std::size_t>(in.readline(line, sizeof line));
+    if (length >= sizeof line) return "--names-from: " + file + " holds a line that is too long";
+    std::string name = line;
+    if (name.size() != length) {
       return "--names-from: " + file + ", line " + std::to_string(number) + " holds a zero byte";
     }
+    if (name.ends_with('\r')) name.pop_back();
     if (!name.empty()) names.push_back(std::move(name));
   }
-  if (in.gcount() == sizeof line - 1)
-    return "--names-from: " + file + " holds a line that is too long";
-  return in.eof() ? "" : "--names-from: could not read " + file;
+  return in.failed() ? "--names-from: could not read " + file : "";
 }
 
-/// Whether the directories that the settings name can be used.
-std::string check_directories(const settings& set) {
-  for (const char* dir : set.search_dirs) {
-    if (LA_DIR(dir).get_dir() == nullptr) {
-      return std::string("--search-dir: not the name of a directory: \"") + dir + "\"";
-    }
+/// Whether the directories that the settings name can be used. Completes the names of those to
+/// search, so that nobody needs to ask for the current directory again.
+std::string check_directories(settings& set) {
+  for (std::string& dir : set.search_dirs) {
+    const char* full_name = LA_DIR(dir.c_str()).get_dir();
+    if (full_name == nullptr) return "--search-dir: not the name of a directory: \"" + dir + "\"";
+    dir = full_name;
   }
   if (set.output_dir != nullptr && !Port::File::isdirectory(set.output_dir)) {
     return std::string("--output-dir: there is no directory \"") + set.output_dir + "\"";
@@ -104,13 +105,12 @@ bool is_dry_run() {
 }
 
 LA_LAUNCHER launcher_of(settings& set) {
-  const auto array = [](std::vector<const char*>& texts) {
-    return texts.empty() ? nullptr : texts.data();
-  };
+  std::vector<const char*> search_dirs;
+  for (const std::string& dir : set.search_dirs) search_dirs.push_back(dir.c_str());
   return {set.part,
-          array(set.search_dirs),
-          static_cast<short>(set.search_dirs.size()),
-          array(set.libraries),
+          search_dirs.data(),
+          static_cast<short>(search_dirs.size()),
+          set.libraries.data(),
           static_cast<short>(set.libraries.size()),
           set.output_dir,
           set.user_rules,
