@@ -17,6 +17,7 @@
 #include <exception>
 #include <optional>
 #include <string>
+#include <unordered_set>
 #include <vector>
 
 #include "cli/completion.h"
@@ -244,10 +245,10 @@ void show_findings(const LA_RULE_SET& set) {
 
 int check(const settings& set) {
   std::vector<std::string> hints;
-  std::optional<diversion> reading([&hints](const Port_Msg& message) {
+  std::unordered_set<std::string> given;
+  std::optional<diversion> reading([&](const Port_Msg& message) {
     const std::string hint = hint_on(message.text);
-    const bool is_new = std::find(hints.begin(), hints.end(), hint) == hints.end();
-    if (!hint.empty() && is_new) hints.push_back(hint);
+    if (!hint.empty() && given.insert(hint).second) hints.push_back(hint);
     return false;
   });
   const LA_RULE_SET rules(set.part, set.user_rules);
