@@ -1,8 +1,8 @@
 #include "cli/relations.h"
 
+#include <array>
 #include <cstdint>
 #include <map>
-#include <utility>
 
 #include "host/hash_index.h"
 
@@ -29,32 +29,13 @@ class numbering {
   la_hash_index index_;
 };
 
-/// A rule by the numbers of its kinds and of the only name that it is for.
-struct numbered_rule {
-  std::size_t source;
-  std::size_t target;
-  std::size_t name;
+/// A rule by numbers: of its kinds, source and target, and of the only name that it is for.
+using numbered_rule = std::array<std::size_t, 3>;
 
-  auto operator<=>(const numbered_rule&) const = default;
-};
+/// For each kind, what rules make of it, or what they make it from.
+using kind_graph = std::vector<std::vector<std::size_t>>;
 
 constexpr std::size_t NONE = SIZE_MAX;
-
-/// Kinds, and the edges from each to others: a list of those that leave it, which NONE ends.
-struct kind_graph {
-  struct edge {
-    std::size_t to;
-    std::size_t next;
-  };
-
-  explicit kind_graph(std::size_t kinds) : first(kinds, NONE) {}
-  void add(std::size_t from, std::size_t to) {
-    edges.push_back({to, std::exchange(first[from], edges.size())});
-  }
-
-  std::vector<std::size_t> first;  ///< by kind
-  std::vector<edge> edges;
-};
 
 /// Puts a kind, and all that can be reached from it, into a group. Those that are in one stay
 /// there, and nothing is looked for beyond them.
@@ -68,9 +49,9 @@ void collect(const kind_graph& graph, std::size_t kind, std::size_t group,
   };
   add(kind);
   while (!rest.empty()) {
-    std::size_t edge = graph.first[rest.back()];
+    const std::size_t from = rest.back();
     rest.pop_back();
-    for (; edge != NONE; edge = graph.edges[edge].next) add(graph.edges[edge].to);
+    for (const std::size_t next : graph[from]) add(next);
   }
 }
 
@@ -78,23 +59,21 @@ void collect(const kind_graph& graph, std::size_t kind, std::size_t group,
 /// that it leads to, but for what is in a loop with it.
 std::vector<std::size_t> with_targets_first(const kind_graph& targets) {
   std::vector<std::size_t> done;
-  std::vector<std::size_t> untried = targets.first;
-  std::vector<bool> entered(untried.size());
+  std::vector<std::size_t> tried(targets.size());
+  std::vector<bool> entered(targets.size());
   std::vector<std::size_t> path;
   const auto enter = [&](std::size_t kind) {
     if (!entered[kind]) path.push_back(kind);
     entered[kind] = true;
   };
-  for (std::size_t start = 0; start < entered.size(); ++start) {
+  for (std::size_t start = 0; start < targets.size(); ++start) {
     enter(start);
     while (!path.empty()) {
-      std::size_t& edge = untried[path.back()];
-      if (edge != NONE) {
-        const auto [to, next] = targets.edges[edge];
-        edge = next;
-        enter(to);
+      const std::size_t kind = path.back();
+      if (tried[kind] < targets[kind].size()) {
+        enter(targets[kind][tried[kind]++]);
       } else {
-        done.push_back(path.back());
+        done.push_back(kind);
         path.pop_back();
       }
     }
@@ -135,8 +114,8 @@ std::vector<relation> relations_of(const LA_RULE_SET& set) {
   kind_graph sources(kinds.count());
   kind_graph targets(kinds.count());
   for (const auto& [source, target, name] : rules) {
-    sources.add(target, source);
-    targets.add(source, target);
+    sources[target].push_back(source);
+    targets[source].push_back(target);
   }
   const std::vector<std::size_t> loops = loops_of(sources, targets);
   std::vector<std::size_t> useful(kinds.count(), NONE);
