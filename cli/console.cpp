@@ -60,7 +60,6 @@ void console::show(void* self, const Port_Msg& message) {
   const std::string_view text = message.text;
   std::fwrite(text.data(), 1, text.size(), stderr);
   if (!text.ends_with('\n')) std::fputc('\n', stderr);
-  if (message.level == PORT_MSG_WARNING || message.level == PORT_MSG_ERROR) flush();
 }
 
 diversion::diversion(std::function<bool(const Port_Msg&)> take)
@@ -76,7 +75,11 @@ void diversion::show(void* self, const Port_Msg& message) {
 }
 
 void complain(const std::string& text) {
-  std::fprintf(stderr, "kestrel-launch: %s\n", text.c_str());
+  complain(std::vector{text});
+}
+
+void complain(const std::vector<std::string>& texts) {
+  for (const std::string& text : texts) std::fprintf(stderr, "kestrel-launch: %s\n", text.c_str());
   console::flush();
 }
 

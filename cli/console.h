@@ -5,12 +5,13 @@
 #include <functional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "host/port_msgman.h"
 
 /// Shows messages on standard error, in colour on a terminal that wants it, until it is destroyed.
-/// A terminal shows each line at once; elsewhere status texts wait for flush, for a netlister to
-/// start or to pause, or for a message that is more than a status.
+/// A terminal shows each line at once; elsewhere texts wait for flush, for a netlister to start or
+/// to pause, or for the end.
 class console {
  public:
   explicit console(bool debug);
@@ -46,8 +47,9 @@ class diversion {
   Port_MsgSink before_;
 };
 
-/// Says on standard error, at once, what the command itself has to say.
+/// Says on standard error, at once, what the command itself has to say: a line for each text.
 void complain(const std::string& text);
+void complain(const std::vector<std::string>& texts);
 
 /// text as a JSON string. A byte that is not UTF-8 becomes the lone surrogate U+DC00 + byte.
 std::string json_string(std::string_view text);

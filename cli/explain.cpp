@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <ctime>
+#include <unordered_set>
 #include <vector>
 
 #include "launcher/baslauncher.h"
@@ -196,10 +197,11 @@ std::string explained(const outcome& found, const LA_EXPLANATION& why) {
   for (const LA_EXPLANATION::CONSIDERED& considered : why.rules) {
     width = std::max(width, UT_STR::Len(considered.rule->rule_name) + 2);
   }
+  std::unordered_set<std::string> lines;
   for (const LA_EXPLANATION::CONSIDERED& considered : why.rules) {
     // One that was wanted more than once has one line.
-    const std::string line = line_of(considered, width);
-    if (rules.find(line) == rules.npos) rules += line;
+    const auto [line, is_new] = lines.insert(line_of(considered, width));
+    if (is_new) rules += *line;
   }
   if (!rules.empty()) text += "\nRules:\n" + rules;
   if (!why.steps.empty()) text += "\nSteps:\n";

@@ -2,10 +2,11 @@
 
 #include <unistd.h>
 
-#include <map>
-#include <set>
 #include <sstream>
 #include <string_view>
+#include <unordered_map>
+#include <unordered_set>
+#include <utility>
 
 #include "cli/nearest.h"
 #include "cli/relations.h"
@@ -67,27 +68,26 @@ std::string hint_on_options(const char* options) {
 
 std::vector<std::string> hints_on(const LA_RULE_SET& set) {
   std::vector<std::string> hints;
-  std::set<std::string> given;
-  std::map<std::string, std::string> on_netlisters;  // PATH is searched once for each
+  std::unordered_set<std::string> given;
+  const auto give = [&](const LA_RULE& rule, const std::string& hint) {
+    if (hint.empty()) return;
+    std::string line = std::string("rule ") + rule.rule_name.get() + ": " + hint;
+    if (given.insert(line).second) hints.push_back(std::move(line));
+  };
+  // PATH is searched once for each.
+  std::unordered_map<std::string_view, std::string> on_netlisters;
   const std::vector<relation> relations = relations_of(set);
   for (int i = 0; i < set.rules.count; ++i) {
     const LA_RULE& rule = *set.rules.elements[i];
+    give(rule, hint_on_relation(rule, relations[static_cast<std::size_t>(i)]));
     const char* netlister = rule.netlister;
-    const bool is_run = netlister != nullptr && UT_STR::_Compare(netlister, "NOT_SUPPORTED") != 0;
-    std::vector<std::string> found = {
-        hint_on_relation(rule, relations[static_cast<std::size_t>(i)])};
-    if (is_run) {
-      const auto [known, is_new] = on_netlisters.try_emplace(netlister);
-      if (is_new) known->second = hint_on_netlister(rule);
-      found.push_back(known->second);
-      found.push_back(hint_on_directory(rule));
-      found.push_back(hint_on_options(rule.netlister_options));
-      if (rule.netlister_top_options) found.push_back(hint_on_options(rule.netlister_top_options));
-    }
-    for (const std::string& hint : found) {
-      const std::string line = std::string("rule ") + rule.rule_name.get() + ": " + hint;
-      if (!hint.empty() && given.insert(line).second) hints.push_back(line);
-    }
+    if (netlister == nullptr || UT_STR::_Compare(netlister, "NOT_SUPPORTED") == 0) continue;
+    const auto [known, is_new] = on_netlisters.try_emplace(netlister);
+    if (is_new) known->second = hint_on_netlister(rule);
+    give(rule, known->second);
+    give(rule, hint_on_directory(rule));
+    give(rule, hint_on_options(rule.netlister_options));
+    if (rule.netlister_top_options) give(rule, hint_on_options(rule.netlister_top_options));
   }
   return hints;
 }

@@ -7,16 +7,17 @@
 //   graph      draws the rules
 //   signals    ends the netlister when the command is to end
 //   main       does what the command line asks for
+#include <fcntl.h>
 #include <signal.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <exception>
-#include <fstream>
-#include <iostream>
 #include <optional>
 #include <string>
+#include <unordered_set>
 #include <vector>
 
 #include "cli/completion.h"
@@ -38,30 +39,31 @@ enum exit_status { ALL_FOUND = 0, NOT_ALL_FOUND = 1, FAILED = 2 };
 
 /// Appends the names in a file, one per line. Returns an empty text, or what is wrong.
 std::string read_names(const std::string& file, std::vector<std::string>& names) {
-  std::ifstream opened;
-  const bool from_input = file == "-";
-  if (!from_input) opened.open(file);
-  std::istream& in = from_input ? std::cin : opened;
+  const int descriptor =
+      file == "-" ? ::dup(STDIN_FILENO) : ::open(file.c_str(), O_RDONLY | O_CLOEXEC);
+  if (descriptor < 0) return "--names-from: could not read " + file;
+  Port::Stream in(descriptor);
   char line[4096];
-  for (int number = 1; in.getline(line, sizeof line); ++number) {
-    std::string name(line, static_cast<std::size_t>(in.gcount()) - (in.eof() ? 0 : 1));
-    if (name.ends_with('\r')) name.pop_back();
-    if (name.find('\0') != name.npos) {
+  for (int number = 1; !in.geteof(); ++number) {
+    const auto length = static_cast<std::size_t>(in.readline(line, sizeof line));
+    if (length >= sizeof line) return "--names-from: " + file + " holds a line that is too long";
+    std::string name = line;
+    if (name.size() != length) {
       return "--names-from: " + file + ", line " + std::to_string(number) + " holds a zero byte";
     }
+    if (name.ends_with('\r')) name.pop_back();
     if (!name.empty()) names.push_back(std::move(name));
   }
-  if (in.gcount() == sizeof line - 1)
-    return "--names-from: " + file + " holds a line that is too long";
-  return in.eof() ? "" : "--names-from: could not read " + file;
+  return in.failed() ? "--names-from: could not read " + file : "";
 }
 
-/// Whether the directories that the settings name can be used.
-std::string check_directories(const settings& set) {
-  for (const char* dir : set.search_dirs) {
-    if (LA_DIR(dir).get_dir() == nullptr) {
-      return std::string("--search-dir: not the name of a directory: \"") + dir + "\"";
-    }
+/// Whether the directories that the settings name can be used. Completes the names of those to
+/// search, so that nobody needs to ask for the current directory again.
+std::string check_directories(settings& set) {
+  for (std::string& dir : set.search_dirs) {
+    const char* full_name = LA_DIR(dir.c_str()).get_dir();
+    if (full_name == nullptr) return "--search-dir: not the name of a directory: \"" + dir + "\"";
+    dir = full_name;
   }
   if (set.output_dir != nullptr && !Port::File::isdirectory(set.output_dir)) {
     return std::string("--output-dir: there is no directory \"") + set.output_dir + "\"";
@@ -79,6 +81,7 @@ std::string complete(settings& set) {
 }
 
 void print_totals(bool ok, int errors, int warnings) {
+  console::flush();
   std::printf("{\"ok\":%s,\"errors\":%d,\"warnings\":%d}\n", ok ? "true" : "false", errors,
               warnings);
 }
@@ -103,13 +106,12 @@ bool is_dry_run() {
 }
 
 LA_LAUNCHER launcher_of(settings& set) {
-  const auto array = [](std::vector<const char*>& texts) {
-    return texts.empty() ? nullptr : texts.data();
-  };
+  std::vector<const char*> search_dirs;
+  for (const std::string& dir : set.search_dirs) search_dirs.push_back(dir.c_str());
   return {set.part,
-          array(set.search_dirs),
-          static_cast<short>(set.search_dirs.size()),
-          array(set.libraries),
+          search_dirs.data(),
+          static_cast<short>(search_dirs.size()),
+          set.libraries.data(),
           static_cast<short>(set.libraries.size()),
           set.output_dir,
           set.user_rules,
@@ -224,6 +226,7 @@ int explain(settings& set) {
     char netlist[LA_MAX_PATH];
     error.clear();
     const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
+    console::flush();
     if (i > 0) std::puts("");
     std::fputs(explained({set.names[i], result, netlist, error}, why).c_str(), stdout);
     status = worse(status, result);
@@ -231,8 +234,10 @@ int explain(settings& set) {
   return status;
 }
 
-/// Says so when there are no rules at all: the data of the installation is probably not found.
-void expect_rules(const LA_RULE_SET& set) {
+/// Shows the findings on the rules, and says so when there are no rules at all: the data of the
+/// installation is probably not found.
+void show_findings(const LA_RULE_SET& set) {
+  console::flush();
   if (set.is_valid && set.rules.count == 0) {
     complain("there are no rules; do MYCORVANE and CORVANE name installation roots?");
   }
@@ -240,17 +245,18 @@ void expect_rules(const LA_RULE_SET& set) {
 
 int check(const settings& set) {
   std::vector<std::string> hints;
-  std::optional<diversion> reading([&hints](const Port_Msg& message) {
+  std::unordered_set<std::string> given;
+  std::optional<diversion> reading([&](const Port_Msg& message) {
     const std::string hint = hint_on(message.text);
-    const bool is_new = std::find(hints.begin(), hints.end(), hint) == hints.end();
-    if (!hint.empty() && is_new) hints.push_back(hint);
+    if (!hint.empty() && given.insert(hint).second) hints.push_back(hint);
     return false;
   });
   const LA_RULE_SET rules(set.part, set.user_rules);
   reading.reset();
-  expect_rules(rules);
+  show_findings(rules);
   if (rules.is_valid) hints = hints_on(rules);
-  for (const std::string& hint : hints) complain("hint: " + hint);
+  for (std::string& hint : hints) hint.insert(0, "hint: ");
+  complain(hints);
   if (set.json) print_totals(rules.is_valid, 0, 0);
   if (!set.json && rules.is_valid) std::printf("Rules checked: %d, all good\n", rules.rules.count);
   return rules.is_valid ? ALL_FOUND : FAILED;
@@ -258,7 +264,7 @@ int check(const settings& set) {
 
 int list_rules(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
-  expect_rules(rules);
+  show_findings(rules);
   const diversion to_output([](const Port_Msg& message) {
     return message.level == PORT_MSG_STATUS && std::fputs(message.text, stdout) >= 0;
   });
@@ -268,13 +274,15 @@ int list_rules(const settings& set) {
 
 int draw_graph(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
-  expect_rules(rules);
+  show_findings(rules);
   if (rules.is_valid) std::fputs(graph_of(rules).c_str(), stdout);
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
 
 int list_parts() {
-  for (const std::string& part : PM_PIC::all_parts()) std::printf("%s\n", part.c_str());
+  const std::vector<std::string> parts = PM_PIC::all_parts();
+  console::flush();
+  for (const std::string& part : parts) std::printf("%s\n", part.c_str());
   return ALL_FOUND;
 }
 

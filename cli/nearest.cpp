@@ -26,9 +26,14 @@ std::size_t distance(std::string_view a, std::string_view b) {
 }  // namespace
 
 std::string nearest(std::string_view word, const std::vector<const char*>& list) {
-  const auto closer = [word](const char* a, const char* b) {
-    return distance(word, a) < distance(word, b);
-  };
-  const auto best = std::min_element(list.begin(), list.end(), closer);
-  return best != list.end() && distance(word, *best) * 2 < word.size() ? *best : "";
+  std::string_view best;
+  std::size_t least = (word.size() + 1) / 2;  // Of a word that is meant, more than half is right.
+  for (const std::string_view known : list) {
+    const auto [shorter, longer] = std::minmax({word.size(), known.size()});
+    if (longer - shorter >= least) continue;
+    const std::size_t found = distance(word, known);
+    if (found < least) best = known;
+    least = std::min(least, found);
+  }
+  return std::string(best);
 }

@@ -1,36 +1,96 @@
 #include "cli/relations.h"
 
+#include <array>
+#include <cstdint>
+#include <map>
+
+#include "host/hash_index.h"
+
 namespace {
 
-/// Which kinds can be made from which, in one step or more.
-class reachability {
+/// Numbers texts from 0 on. The case of letters does not count, and an absent text is an empty one.
+class numbering {
  public:
-  explicit reachability(const DARRAY_LA_RULE_PTR& rules) {
-    for (const LA_RULE* rule : rules) {
-      next_[kind_of(*rule->netlist_file)].insert(kind_of(*rule->target));
+  std::size_t number_of(const char* text) {
+    if (text == nullptr) text = "";
+    int& number = index_.place(la_hash(text), [&](int known) {
+      return UT_STR::ICompare(texts_[static_cast<std::size_t>(known)], text) == 0;
+    });
+    if (number == la_hash_index::NONE) {
+      number = static_cast<int>(texts_.size());
+      texts_.push_back(text);
     }
+    return static_cast<std::size_t>(number);
   }
-  bool leads(const std::string& from, const std::string& to) {
-    const auto [known, is_new] = made_.try_emplace(from);
-    if (is_new) collect(from, known->second);
-    return known->second.contains(to);
-  }
+  std::size_t count() const { return texts_.size(); }
 
  private:
-  void collect(const std::string& from, std::set<std::string>& made) {
-    std::vector<std::string> rest = {from};
-    while (!rest.empty()) {
-      const std::string kind = rest.back();
-      rest.pop_back();
-      for (const std::string& next : next_[kind]) {
-        if (made.insert(next).second) rest.push_back(next);
+  std::vector<const char*> texts_;
+  la_hash_index index_;
+};
+
+/// A rule by numbers: of its kinds, source and target, and of the only name that it is for.
+using numbered_rule = std::array<std::size_t, 3>;
+
+/// For each kind, what rules make of it, or what they make it from.
+using kind_graph = std::vector<std::vector<std::size_t>>;
+
+constexpr std::size_t NONE = SIZE_MAX;
+
+/// Puts a kind, and all that can be reached from it, into a group. Those that are in one stay
+/// there, and nothing is looked for beyond them.
+void collect(const kind_graph& graph, std::size_t kind, std::size_t group,
+             std::vector<std::size_t>& groups) {
+  std::vector<std::size_t> rest;
+  const auto add = [&](std::size_t reached) {
+    if (groups[reached] != NONE) return;
+    groups[reached] = group;
+    rest.push_back(reached);
+  };
+  add(kind);
+  while (!rest.empty()) {
+    const std::size_t from = rest.back();
+    rest.pop_back();
+    for (const std::size_t next : graph[from]) add(next);
+  }
+}
+
+/// All kinds, in the order in which a search into the depth is done with them: each behind those
+/// that it leads to, but for what is in a loop with it.
+std::vector<std::size_t> with_targets_first(const kind_graph& targets) {
+  std::vector<std::size_t> done;
+  std::vector<std::size_t> tried(targets.size());
+  std::vector<bool> entered(targets.size());
+  std::vector<std::size_t> path;
+  const auto enter = [&](std::size_t kind) {
+    if (!entered[kind]) path.push_back(kind);
+    entered[kind] = true;
+  };
+  for (std::size_t start = 0; start < targets.size(); ++start) {
+    enter(start);
+    while (!path.empty()) {
+      const std::size_t kind = path.back();
+      if (tried[kind] < targets[kind].size()) {
+        enter(targets[kind][tried[kind]++]);
+      } else {
+        done.push_back(kind);
+        path.pop_back();
       }
     }
   }
+  return done;
+}
 
-  std::map<std::string, std::set<std::string>> next_;
-  std::map<std::string, std::set<std::string>> made_;
-};
+/// The loop that each kind is in. One that is in none is alone in its own.
+std::vector<std::size_t> loops_of(const kind_graph& sources, const kind_graph& targets) {
+  const std::vector<std::size_t> kinds = with_targets_first(targets);
+  std::vector<std::size_t> loops(kinds.size(), NONE);
+  // What leads to a kind, and stands before it, can also be reached from it.
+  for (auto kind = kinds.rbegin(); kind != kinds.rend(); ++kind) {
+    collect(sources, *kind, *kind, loops);
+  }
+  return loops;
+}
 
 }  // namespace
 
@@ -41,24 +101,35 @@ std::string kind_of(const LA_FILE& file) {
 }
 
 std::vector<relation> relations_of(const LA_RULE_SET& set) {
-  std::vector<relation> relations;
-  reachability kinds(set.rules);
-  // By source, target, and the only name that the rule is for.
-  std::map<std::vector<std::string>, const LA_RULE*> used;
+  numbering kinds;
+  numbering names;
+  const std::size_t native = kinds.number_of("kbo");
+  const std::size_t any_name = names.number_of(nullptr);
+  std::vector<numbered_rule> rules;
   for (const LA_RULE* rule : set.rules) {
-    const std::string source = kind_of(*rule->netlist_file);
-    const std::string target = kind_of(*rule->target);
-    std::string name = rule->netlist_file->get_name() ? rule->netlist_file->get_name() : "";
-    UT_STR::Lower(name.data());
-    relation to_others;
-    for (const std::string& of : {name, std::string()}) {
-      const auto earlier = used.find({source, target, of});
-      if (earlier != used.end()) to_others.overridden_by = earlier->second;
-    }
-    used.try_emplace({source, target, name}, rule);
-    to_others.is_in_loop = source == target || kinds.leads(target, source);
-    to_others.is_useful = target == ".kbo" || kinds.leads(target, ".kbo");
-    relations.push_back(to_others);
+    rules.push_back({kinds.number_of(rule->netlist_file->get_ext()),
+                     kinds.number_of(rule->target->get_ext()),
+                     names.number_of(rule->netlist_file->get_name())});
+  }
+  kind_graph sources(kinds.count());
+  kind_graph targets(kinds.count());
+  for (const auto& [source, target, name] : rules) {
+    sources[target].push_back(source);
+    targets[source].push_back(target);
+  }
+  const std::vector<std::size_t> loops = loops_of(sources, targets);
+  std::vector<std::size_t> useful(kinds.count(), NONE);
+  collect(sources, native, native, useful);
+
+  std::vector<relation> relations;
+  std::map<numbered_rule, const LA_RULE*> used;
+  for (std::size_t i = 0; i < rules.size(); ++i) {
+    const auto& [source, target, name] = rules[i];
+    const auto for_any = used.find({source, target, any_name});
+    const auto [same, is_new] = used.try_emplace(rules[i], set.rules.elements[i]);
+    const LA_RULE* earlier = is_new ? nullptr : same->second;
+    relations.push_back({for_any != used.end() ? for_any->second : earlier,
+                         loops[source] == loops[target], useful[target] != NONE});
   }
   return relations;
 }

@@ -2,8 +2,6 @@
 #ifndef KESTREL_CLI_RELATIONS_H
 #define KESTREL_CLI_RELATIONS_H
 
-#include <map>
-#include <set>
 #include <string>
 #include <vector>
 

@@ -12,7 +12,7 @@ constexpr option OPTIONS[] = {
     {"-p", "--part", "PART", "device part name",
      [](settings& to, const char* text) { to.part = text; }},
     {"-sd", "--search-dir", "DIR", "search directory; may be repeated, searched in order",
-     [](settings& to, const char* text) { to.search_dirs.push_back(text); }},
+     [](settings& to, const char* text) { to.search_dirs.emplace_back(text); }},
     {"-l", "--library", "TEXT", "library entry; may be repeated",
      [](settings& to, const char* text) { to.libraries.push_back(text); }},
     {"-o", "--output-dir", "DIR", "where netlisters write (default: the current directory)",

@@ -19,11 +19,11 @@ enum class task {
   VERSION
 };
 
-/// The settings of one call. The texts belong to the command line.
+/// The settings of one call. Texts that are pointers belong to the command line.
 struct settings {
   task what = task::RESOLVE;
   const char* part = nullptr;
-  std::vector<const char*> search_dirs;
+  std::vector<std::string> search_dirs;
   std::vector<const char*> libraries;
   const char* output_dir = nullptr;
   const char* user_rules = nullptr;

@@ -88,14 +88,18 @@ struct World {
   /// Constructs a launcher from a command line and resolves its names. Tells all that is said, and
   /// for each name "RESULT SOURCE NETLIST" with the counts that are not 0.
   std::string find(const std::vector<std::string>& words) {
-    std::vector<const char*> texts(words.size());
-    std::transform(words.begin(), words.end(), texts.begin(), [](auto& w) { return w.c_str(); });
+    const auto chars_of = [](const std::vector<std::string>& strings) {
+      std::vector<const char*> chars;
+      for (const std::string& string : strings) chars.push_back(string.c_str());
+      return chars;
+    };
+    const std::vector<const char*> texts = chars_of(words);
     settings set;
     EXPECT_EQ(read_command_line(static_cast<int>(texts.size()), texts.data(), set), "");
     const Variable path("PATH", tree.full("bin").c_str());
     const Variable test("LA_TEST", set.dry_run ? "" : nullptr);
     const Variable detail("LAUNCHER_DETAIL", set.detail ? "" : nullptr);
-    LA_LAUNCHER launcher(set.part, set.search_dirs.data(),
+    LA_LAUNCHER launcher(set.part, chars_of(set.search_dirs).data(),
                          static_cast<short>(set.search_dirs.size()), set.libraries.data(),
                          static_cast<short>(set.libraries.size()), set.output_dir, set.user_rules,
                          set.force, set.ignore_timestamps, set.ignore_locs, set.add_pads, set.quiet,
