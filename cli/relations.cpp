@@ -14,7 +14,7 @@ class numbering {
   std::size_t number_of(const char* text) {
     if (text == nullptr) text = "";
     int& number = index_.place(la_hash(text), [&](int known) {
-      return UT_STR::ICompare(texts_[static_cast<std::size_t>(known)], text) == 0;
+      return UT_STR::ICompare(la_at(texts_, known), text) == 0;
     });
     if (number == la_hash_index::NONE) {
       number = static_cast<int>(texts_.size());
