@@ -81,9 +81,10 @@ class expander {
   /// Expands the text from at to the terminator at end. False after a failure, which has said why.
   bool expand(const char* at, const char* end) {
     la_expand_steps = 1;
-    *part_ = {at, end, 0, 0, part_kind::TEMPLATE, false, false, false};
-    for (bool good = true; good;) {
+    *part_ = {at, end, 0, 0, part_kind::TEMPLATE, false, false};
+    for (;;) {
       if (kind_of(*at) != MARK) expand_literal(at);
+      bool good = true;
       switch (*at) {
         case '$':
           good = expand_keyword(++at);
@@ -97,22 +98,23 @@ class expander {
         default:
           if (*at == ']' && part_->open) {
             part_->end = at;
-            part_->open = false;
-          }
-          if (at != part_->end) {
+            good = end_group(at);
+          } else if (at != part_->end) {
             expand_literal(at);
+          } else if (part_->open) {
+            good = fail(OPEN_OPTIONAL);
           } else if (part_->kind == part_kind::TEMPLATE) {
             return true;
           } else {
             good = end_group(at);
           }
       }
+      if (!good) return false;
     }
-    return false;
   }
 
   /// Whether the result fits into the buffer, with its terminator.
-  bool fits() const { return length_ < size_ && !lost_; }
+  bool fits() const { return length_ < size_; }
   /// The result, if it fits, and behind it the terminator.
   std::string_view result() {
     buffer_[length_] = '\0';
@@ -130,7 +132,6 @@ class expander {
     int position;           ///< the index of the values that its keywords give
     part_kind kind;
     bool open;  ///< whether its "]" is yet to be found: end is that of the part around it
-    bool lost;  ///< as it was when the part began
     bool substituted;
   };
 
@@ -144,8 +145,11 @@ class expander {
 
   bool expand_keyword(const char*& at) {
     const char* name = at;
-    if (kind_of(*name) == MARK && !find_ends()) return fail(OPEN_OPTIONAL);
-    const char first = name == part_->end ? '\0' : *name;
+    char first = *name;
+    if (kind_of(first) == MARK) {
+      if (!find_ends()) return fail(OPEN_OPTIONAL);
+      if (name == part_->end) first = '\0';
+    }
     const LA_KEYWORD_ENTRY* entry = keywords_[bucket(first)];
     while (entry != nullptr && !begins(*entry, name)) entry = entry->next;
     if (entry != nullptr && entry->name_length != 0) {
@@ -177,7 +181,7 @@ class expander {
   }
 
   bool begin_group(const char* at, part_kind kind, const char* end) {
-    *++part_ = {at, end, length_, 0, kind, kind == part_kind::OPTIONAL, lost_, false};
+    *++part_ = {at, end, length_, 0, kind, kind == part_kind::OPTIONAL, false};
     return count_step();
   }
 
@@ -185,14 +189,12 @@ class expander {
 
   void drop_group(const char*& at) {
     length_ = part_->length;
-    lost_ = part_->lost;
     at = part_->end + 1;
     --part_;
   }
 
   /// Keeps or drops a group, and begins the next copy of one that repeats.
   bool end_group(const char*& at) {
-    if (part_->open) return fail(OPEN_OPTIONAL);
     if (!part_->substituted) {
       drop_group(at);
       return true;
@@ -205,7 +207,6 @@ class expander {
     }
     at = part_->body;
     part_->length = length_;
-    part_->lost = lost_;
     part_->substituted = false;
     ++part_->position;
     return count_step();
@@ -234,7 +235,7 @@ class expander {
   /// Appends a piece, which something other than a blank follows. Where blanks at its front meet
   /// blanks at the end of the text, or the beginning of the group, one of them remains, or none.
   void join_option(const char* piece, std::ptrdiff_t size) {
-    if (*piece == ' ' && !lost_) {
+    if (*piece == ' ' && length_ <= size_) {
       const bool empty = length_ == part_->length;
       if (empty || buffer_[length_ - 1] == ' ') {
         while (*piece == ' ') ++piece, --size;
@@ -256,14 +257,14 @@ class expander {
     }
   }
 
-  /// Appends a piece that may not fit. What does not is lost, and perhaps dropped with its group:
-  /// but for blanks at the end of the text, which the next ones take the place of.
+  /// Appends a piece that may not fit. Blanks beyond the buffer do not count: what follows them
+  /// removes them, or does not fit either.
   void append_near_end(const char* piece, std::ptrdiff_t size) {
     for (const char* end = piece + size; piece != end; ++piece) {
-      if (length_ != size_) {
+      if (length_ < size_) {
         buffer_[length_++] = *piece;
       } else if (*piece != ' ') {
-        lost_ = true;
+        length_ = size_ + 1;
       }
     }
   }
@@ -292,8 +293,7 @@ class expander {
   LA_KEYWORD_ENTRY* const* keywords_;
   char* buffer_;
   std::ptrdiff_t size_;
-  std::ptrdiff_t length_ = 0;
-  bool lost_ = false;  ///< whether anything but blanks did not fit
+  std::ptrdiff_t length_ = 0;  ///< one more than the buffer has when something did not fit
   part* part_ = parts_;
   part parts_[STEP_LIMIT + 1];
 };
