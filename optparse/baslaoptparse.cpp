@@ -78,10 +78,20 @@ class expander {
   expander(LA_KEYWORD_ENTRY* const* keywords, char* result, int size)
       : keywords_(keywords), buffer_(result), size_(size) {}
 
-  /// Expands the text from at to the terminator at end. False after a failure, which has said why.
-  bool expand(const char* at, const char* end) {
+  /// Takes a template, and keeps a copy of it, as it may lie where the result goes. False if it is
+  /// too long.
+  bool read(const char* options) {
+    const void* behind = ::memccpy(text_, options, '\0', LA_MAX_PATH);
+    if (behind == nullptr) return false;
+    *part_ = {text_, static_cast<const char*>(behind) - 1, 0, 0, part_kind::TEMPLATE, false, false};
+    return true;
+  }
+  const char* text() const { return text_; }
+
+  /// Expands the template. False after a failure, which has said why.
+  bool expand() {
     la_expand_steps = 1;
-    *part_ = {at, end, 0, 0, part_kind::TEMPLATE, false, false};
+    const char* at = text_;
     for (;;) {
       if (kind_of(*at) != MARK) expand_literal(at);
       bool good = true;
@@ -296,6 +306,7 @@ class expander {
   std::ptrdiff_t length_ = 0;  ///< one more than the buffer has when something did not fit
   part* part_ = parts_;
   part parts_[STEP_LIMIT + 1];
+  char text_[LA_MAX_PATH + BLOCK];
 };
 
 }  // namespace
@@ -364,22 +375,20 @@ void LA_KEYWORD_TABLE::add_keyword(const char* name, const char* value) {
 }
 
 unsigned char LA_KEYWORD_TABLE::expand(const char* options, char* result, int size) const {
-  char text[LA_MAX_PATH + BLOCK];
-  const void* behind = ::memccpy(text, options, '\0', LA_MAX_PATH);
-  if (behind == nullptr) {
+  expander expansion(first_, result, size);
+  if (!expansion.read(options)) {
     message().issueError("Launcher: Option string \"%s\" is longer than %d characters\n", options,
                          LA_MAX_PATH - 1);
     std::memmove(result, options, UT_STR::Len(options) + 1);
     return 0;
   }
-  expander expansion(first_, result, size);
-  const bool expanded = expansion.expand(text, static_cast<const char*>(behind) - 1);
+  const bool expanded = expansion.expand();
   if (!expanded || !expansion.fits()) {
-    UT_STR::Copy(result, text);
+    UT_STR::Copy(result, expansion.text());
     if (expanded) {
       message().issueError(
-          "Launcher: The expansion of option string \"%s\" is longer than %d characters\n", text,
-          size - 1);
+          "Launcher: The expansion of option string \"%s\" is longer than %d characters\n",
+          expansion.text(), size - 1);
     }
     return 0;
   }
