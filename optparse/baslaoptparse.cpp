@@ -107,16 +107,13 @@ class expander {
           break;
         default:
           if (*at == ']' && part_->open) {
-            part_->end = at;
             good = end_group(at);
           } else if (at != part_->end) {
             expand_literal(at);
-          } else if (part_->open) {
-            good = fail(OPEN_OPTIONAL);
           } else if (part_->kind == part_kind::TEMPLATE) {
             return true;
           } else {
-            good = end_group(at);
+            good = part_->open ? fail(OPEN_OPTIONAL) : end_group(at);
           }
       }
       if (!good) return false;
@@ -179,8 +176,9 @@ class expander {
     }
     if (part_->kind == part_kind::TEMPLATE) return fail(NOT_OPTIONAL, {name, at});
     if (!find_ends()) return fail(OPEN_OPTIONAL);
-    drop_group(at);
-    return true;
+    part_->substituted = false;
+    at = part_->end;
+    return end_group(at);
   }
 
   bool begin_repeat(const char* at) {
@@ -197,49 +195,40 @@ class expander {
 
   bool count_step() { return ++la_expand_steps <= STEP_LIMIT || fail(TOO_MANY_STEPS); }
 
-  void drop_group(const char*& at) {
-    length_ = part_->length;
-    at = part_->end + 1;
-    --part_;
-  }
-
   /// Keeps or drops a group, and begins the next copy of one that repeats.
   bool end_group(const char*& at) {
     if (!part_->substituted) {
-      drop_group(at);
-      return true;
+      length_ = part_->length;
+    } else {
+      part_[-1].substituted = true;
+      if (part_->kind == part_kind::REPEAT) {
+        at = part_->body;
+        part_->length = length_;
+        part_->substituted = false;
+        ++part_->position;
+        return count_step();
+      }
     }
-    part_[-1].substituted = true;
-    if (part_->kind == part_kind::OPTIONAL) {
-      ++at;
-      --part_;
-      return true;
-    }
-    at = part_->body;
-    part_->length = length_;
-    part_->substituted = false;
-    ++part_->position;
-    return count_step();
+    ++at;
+    --part_;
+    return true;
   }
 
   /// Finds the ends of the optional groups that are open. False if there is none for one.
   bool find_ends() {
     for (part* group = parts_ + 1; group <= part_; ++group) {
       if (!group->open) continue;
-      group->end = end_of_optional(group->body, group[-1].end);
-      if (group->end == group[-1].end) return false;
+      const char* at = group->body;
+      const char* end = group[-1].end;
+      for (int depth = 0; at != end; ++at) {
+        if (*at == '[') ++depth;
+        if (*at == ']' && depth-- == 0) break;
+      }
+      if (at == end) return false;
+      group->end = at;
       group->open = false;
     }
     return true;
-  }
-
-  /// The "]" that balances the "[" in front of at, or end.
-  static const char* end_of_optional(const char* at, const char* end) {
-    for (int depth = 0; at != end; ++at) {
-      if (*at == '[') ++depth;
-      if (*at == ']' && depth-- == 0) break;
-    }
-    return at;
   }
 
   /// Appends a piece, which something other than a blank follows. Where blanks at its front meet
@@ -320,10 +309,8 @@ LA_KEYWORD_ENTRY::LA_KEYWORD_ENTRY(const char* name)
 
 void LA_KEYWORD_ENTRY::add_value(const char* value) {
   const std::size_t length = value != nullptr ? UT_STR::Len(value) : 0;
-  char* copy = nullptr;
-  if (value != nullptr) {
-    copy = static_cast<char*>(std::memcpy(new char[length + 1 + BLOCK], value, length + 1));
-  }
+  char* copy = value != nullptr ? new char[length + 1 + BLOCK] : nullptr;
+  if (value != nullptr) std::memcpy(copy, value, length + 1);
   lengths.push_back(static_cast<std::ptrdiff_t>(length));
   values.append(copy);
 }
