@@ -106,14 +106,13 @@ class expander {
           good = begin_repeat(++at);
           break;
         default:
-          if (*at == ']' && part_->open) {
-            good = end_group(at);
-          } else if (at != part_->end) {
+          if (at != part_->end && !(*at == ']' && part_->open)) {
+            may_have_stray_ = true;
             expand_literal(at);
           } else if (part_->kind == part_kind::TEMPLATE) {
             return true;
           } else {
-            good = part_->open ? fail(OPEN_OPTIONAL) : end_group(at);
+            good = end_group(at);
           }
       }
       if (!good) return false;
@@ -122,6 +121,8 @@ class expander {
 
   /// Whether the result fits into the buffer, with its terminator.
   bool fits() const { return length_ < size_; }
+  /// Whether a "}" or "]" may have come into the result.
+  bool may_have_stray() const { return may_have_stray_; }
   /// The result, if it fits, and behind it the terminator.
   std::string_view result() {
     buffer_[length_] = '\0';
@@ -172,6 +173,7 @@ class expander {
     if (value != nullptr) {
       join_option(value, entry->lengths[static_cast<std::size_t>(position)]);
       part_->substituted = true;
+      may_have_stray_ |= entry->has_stray;
       return true;
     }
     if (part_->kind == part_kind::TEMPLATE) return fail(NOT_OPTIONAL, {name, at});
@@ -195,8 +197,9 @@ class expander {
 
   bool count_step() { return ++la_expand_steps <= STEP_LIMIT || fail(TOO_MANY_STEPS); }
 
-  /// Keeps or drops a group, and begins the next copy of one that repeats.
+  /// Keeps or drops a group that ends at at, and begins the next copy of one that repeats.
   bool end_group(const char*& at) {
+    if (part_->open && *at != ']') return fail(OPEN_OPTIONAL);
     if (!part_->substituted) {
       length_ = part_->length;
     } else {
@@ -293,6 +296,7 @@ class expander {
   char* buffer_;
   std::ptrdiff_t size_;
   std::ptrdiff_t length_ = 0;  ///< one more than the buffer has when something did not fit
+  bool may_have_stray_ = false;
   part* part_ = parts_;
   part parts_[STEP_LIMIT + 1];
   char text_[LA_MAX_PATH + BLOCK];
@@ -311,6 +315,7 @@ void LA_KEYWORD_ENTRY::add_value(const char* value) {
   const std::size_t length = value != nullptr ? UT_STR::Len(value) : 0;
   char* copy = value != nullptr ? new char[length + 1 + BLOCK] : nullptr;
   if (value != nullptr) std::memcpy(copy, value, length + 1);
+  has_stray |= value != nullptr && std::strpbrk(value, "]}") != nullptr;
   lengths.push_back(static_cast<std::ptrdiff_t>(length));
   values.append(copy);
 }
@@ -380,6 +385,7 @@ unsigned char LA_KEYWORD_TABLE::expand(const char* options, char* result, int si
     return 0;
   }
   const std::string_view all = expansion.result();
+  if (!expansion.may_have_stray()) return 1;
   const finding* stray = all.find('}') != all.npos   ? &STRAY_REPEAT
                          : all.find(']') != all.npos ? &STRAY_OPTIONAL
                                                      : nullptr;

@@ -38,6 +38,7 @@ class LA_KEYWORD_ENTRY {
   std::uint64_t mask = 0;               ///< ones where head has characters
   DARRAY_NAME values;                   ///< at least one in a table
   std::vector<std::ptrdiff_t> lengths;  ///< of the values
+  bool has_stray = false;               ///< whether a value has, or had, a "}" or "]"
   LA_KEYWORD_ENTRY* next = nullptr;     ///< in the table's chain
 };
 
