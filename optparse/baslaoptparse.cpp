@@ -339,16 +339,15 @@ LA_KEYWORD_ENTRY& LA_KEYWORD_TABLE::entry(const char* name) {
     if (UT_STR::Compare(entry->name, name) == 0) return *entry;
   }
   auto created = std::make_unique<LA_KEYWORD_ENTRY>(name);
-  // What no reference begins with is in no chain. An empty name begins every reference: it ends all
-  // chains, and nothing comes behind it.
+  // What no reference begins with is in no chain. An empty name begins every reference.
   const bool is_empty = created->name_length == 0;
   const bool is_name = std::all_of(name + (is_empty ? 0 : 1), name + created->name_length,
                                    [](char c) { return kind_of(c) == LETTER; });
   for (std::size_t i = 0; is_name && i < std::size(first_); ++i) {
     if (!is_empty && i != bucket(name[0])) continue;
     LA_KEYWORD_ENTRY** link = &first_[i];
-    while (*link != nullptr && (*link)->name_length != 0) link = &(*link)->next;
-    if (*link == nullptr) *link = created.get();
+    while (*link != nullptr) link = &(*link)->next;
+    *link = created.get();
   }
   entries.append(created.get());
   return *created.release();
