@@ -339,6 +339,7 @@ LA_KEYWORD_ENTRY& LA_KEYWORD_TABLE::entry(const char* name) {
     if (UT_STR::Compare(entry->name, name) == 0) return *entry;
   }
   auto created = std::make_unique<LA_KEYWORD_ENTRY>(name);
+  entries.append(created.get());
   // What no reference begins with is in no chain. An empty name begins every reference.
   const bool is_empty = created->name_length == 0;
   const bool is_name = std::all_of(name + (is_empty ? 0 : 1), name + created->name_length,
@@ -349,7 +350,6 @@ LA_KEYWORD_ENTRY& LA_KEYWORD_TABLE::entry(const char* name) {
     while (*link != nullptr) link = &(*link)->next;
     *link = created.get();
   }
-  entries.append(created.get());
   return *created.release();
 }
 
