@@ -48,9 +48,10 @@ enum character : unsigned char { PLAIN, LETTER, MARK };
 
 constexpr std::array<character, 256> CHARACTERS = [] {
   std::array<character, 256> kinds = {};
-  for (int c = 'a'; c <= 'z'; ++c) kinds[c] = kinds[c - 'a' + 'A'] = LETTER;
+  for (std::size_t c = 'a'; c <= 'z'; ++c) kinds[c] = kinds[c - 'a' + 'A'] = LETTER;
   kinds['_'] = LETTER;
-  for (const char mark : {'$', '[', ']', '{', '}', '\0'}) kinds[mark] = MARK;
+  // The terminator of the marks is one of them.
+  for (const char mark : "$[]{}") kinds[static_cast<unsigned char>(mark)] = MARK;
   return kinds;
 }();
 
