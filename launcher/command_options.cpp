@@ -70,8 +70,7 @@ bool la_command_options::keep_names_in_place(const std::string& start, const cha
   // Stand-ins may be longer than the names.
   constexpr int SIZE = 4 * LA_MAX_OPTIONS;
   const std::unique_ptr<char[]> options(new char[SIZE]);
-  UT_STR::Copy(options.get(), options_template, SIZE);
-  if (!plain_.expand(options.get(), SIZE)) return false;
+  if (!plain_.expand(options_template, options.get(), SIZE)) return false;
   std::vector<std::string> words;
   std::vector<std::string> meant;
   // A template that cannot be split, for want of a quote, must not find its partner in a name.

@@ -9,8 +9,9 @@
 #ifndef KESTREL_OPTPARSE_BASLAOPTPARSE_H
 #define KESTREL_OPTPARSE_BASLAOPTPARSE_H
 
-#include <climits>
-#include <string_view>
+#include <cstddef>
+#include <cstdint>
+#include <vector>
 
 #include "host/ut_darray.h"
 #include "host/ut_str.h"
@@ -19,7 +20,7 @@
 class LA_KEYWORD_ENTRY {
  public:
   /// A keyword of this name, without values.
-  explicit LA_KEYWORD_ENTRY(const char* name) : name(name), values(3) {}
+  explicit LA_KEYWORD_ENTRY(const char* name);
   LA_KEYWORD_ENTRY(const LA_KEYWORD_ENTRY&) = delete;
   LA_KEYWORD_ENTRY& operator=(const LA_KEYWORD_ENTRY&) = delete;
   ~LA_KEYWORD_ENTRY() { clear_values(); }
@@ -32,7 +33,13 @@ class LA_KEYWORD_ENTRY {
   void dump() const;
 
   la_text name;
-  DARRAY_NAME values;  ///< at least one in a table
+  std::size_t name_length;
+  std::uint64_t head = 0;               ///< the first characters of the name, padded with zeros
+  std::uint64_t mask = 0;               ///< ones where head has characters
+  DARRAY_NAME values;                   ///< at least one in a table
+  std::vector<std::ptrdiff_t> lengths;  ///< of the values
+  bool has_stray = false;               ///< whether a value has, or had, a "}" or "]"
+  LA_KEYWORD_ENTRY* next = nullptr;     ///< in the table's chain
 };
 
 using DARRAY_LA_KEYWORD_ENTRY_PTR = UT_TYPED_DARRAY<LA_KEYWORD_ENTRY*>;
@@ -40,7 +47,7 @@ using DARRAY_LA_KEYWORD_ENTRY_PTR = UT_TYPED_DARRAY<LA_KEYWORD_ENTRY*>;
 /// The keywords that a template may name, in the order in which they were defined.
 class LA_KEYWORD_TABLE {
  public:
-  LA_KEYWORD_TABLE();
+  LA_KEYWORD_TABLE() : entries(10) {}
   LA_KEYWORD_TABLE(const LA_KEYWORD_TABLE&) = delete;
   LA_KEYWORD_TABLE& operator=(const LA_KEYWORD_TABLE&) = delete;
   ~LA_KEYWORD_TABLE();
@@ -49,25 +56,26 @@ class LA_KEYWORD_TABLE {
   void set_keyword(const char* name, const char* value);
   /// Appends a value to those of the keyword.
   void add_keyword(const char* name, const char* value);
-  /// The first keyword that the reference begins with, in any case of letters: a longer reference
-  /// is that keyword too. Null when there is none.
-  const LA_KEYWORD_ENTRY* find(std::string_view reference) const;
   /// Expands the template in options, a buffer of size characters, in place. The template holds
   /// less than LA_MAX_PATH characters. Returns 1, or 0 after an error message; only a template that
   /// takes more than 100 steps fails without one. After a failure options holds the template, or,
   /// when the result has a stray "}" or "]", that result. Allocates nothing.
-  unsigned char expand(char* options, int size = LA_MAX_PATH) const;
+  unsigned char expand(char* options, int size = LA_MAX_PATH) const {
+    return expand(options, options, size);
+  }
+  /// The same for a template that stays where it is: what is said of options goes for result, a
+  /// buffer of size characters that has room for the template, too.
+  unsigned char expand(const char* options, char* result, int size) const;
   /// Issues one status message for each value of each keyword.
   void dump() const;
 
  private:
   LA_KEYWORD_ENTRY& entry(const char* name);
 
-  static constexpr int NONE = INT_MAX;
-
   DARRAY_LA_KEYWORD_ENTRY_PTR entries;
-  /// Where to begin the search, by the first character of a reference.
-  int first_[32];
+  /// The keywords that a reference may begin with, by its first character, chained in their order:
+  /// the first that it does begin with, in any case of letters, is the one that it means.
+  LA_KEYWORD_ENTRY* first_[32] = {};
 };
 
 #endif

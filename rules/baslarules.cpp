@@ -292,8 +292,8 @@ bool check_template(const LA_RULE& rule, const char* keyword, const char* text,
                     const LA_KEYWORD_TABLE& table) {
   if (text == nullptr) return true;
   char options[LA_MAX_PATH];
-  const bool fits = UT_STR::Copy(options, text) != nullptr;
-  if (fits && table.expand(options)) return true;
+  const bool fits = UT_STR::Len(text) < LA_MAX_PATH;
+  if (fits && table.expand(text, options, LA_MAX_PATH)) return true;
   message().issueError("Launcher: Error parsing %s \"%s\" for rule %s\n", keyword,
                        fits ? options : text, rule.rule_name.get());
   return false;

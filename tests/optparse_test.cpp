@@ -12,10 +12,10 @@ extern "C" void __sanitizer_malloc_hook(const volatile void* /*memory*/, std::si
 }
 
 static const std::vector<std::pair<std::string, std::vector<const char*>>> KEYWORDS = {
-    {"part", {"dev1"}},     {"quiet", {nullptr}}, {"libraries", {"/a", "/b"}},
-    {"in", {"top.edf"}},    {"lead", {"  v  "}},  {"empty", {""}},
-    {"round", {"a]"}},      {"curly", {"a}"}},    {"partial", {"never"}},
-    {"gap", {"1", nullptr}}};
+    {"part", {"dev1"}},      {"quiet", {nullptr}}, {"libraries", {"/a", "/b"}},
+    {"in", {"top.edf"}},     {"lead", {"  v  "}},  {"empty", {""}},
+    {"round", {"a]"}},       {"curly", {"a}"}},    {"partial", {"never"}},
+    {"gap", {"1", nullptr}}, {"x2", {"never"}}};
 
 struct Table : LA_KEYWORD_TABLE {
   Table() {
@@ -62,11 +62,13 @@ TEST(Templates, ExpandInEveryNesting) {
 
 TEST(Templates, LimitsAndDump) {
   const std::string longest(259, 'x');
-  const std::string text = "[$long$long$quiet][$long[$long$quiet]]$long";
+  const std::string text = "[$long$long$long $quiet][$long[$long$quiet]]$long";
   Table keywords;
   keywords.set_keyword("long", longest.c_str());
   EXPECT_EQ(keywords.expanded(text, 519), "<" + longest + longest + ">");
   EXPECT_EQ(keywords.expanded(longest), "<" + longest + ">");
+  EXPECT_EQ(keywords.expanded(longest, 300), "<" + longest + ">");
+  EXPECT_EQ(keywords.expanded("$long      $lead", 264), "<" + longest + " v  >");
   const std::string said = keywords.expanded(text, 518) + keywords.expanded(longest + "y", 1000);
   EXPECT_NE(said.find("of option string \"" + text + "\" is longer than 517 ch"), said.npos);
   EXPECT_NE(said.find("Option string \"" + longest + "y\" is longer than 259 ch"), said.npos);
@@ -75,6 +77,12 @@ TEST(Templates, LimitsAndDump) {
   EXPECT_EQ(keywords.expanded("{$libraries}"), "<" + std::string(98, 'c') + ">");
   keywords.add_keyword("libraries", "c");
   EXPECT_EQ(keywords.expanded("{$libraries}"), "");
+  const std::string open = replaced(std::string(100, '.'), ".", "[]") + "[";
+  EXPECT_EQ(keywords.expanded("[" + open), "332 Missing ']' in option string\n");
+  // An empty name begins every reference.
+  keywords.set_keyword("", "e");
+  keywords.set_keyword("other", "never");
+  EXPECT_EQ(keywords.expanded("$part$other$-$"), "<dev1eee>");
   Messages messages;
   keywords.dump();
   EXPECT_EQ(messages.records.at(0).origin, "optparse/baslaoptparse.cpp:84 $Revision: 1.6 $");
