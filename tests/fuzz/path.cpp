@@ -37,7 +37,9 @@ void examine(const std::string& input, Tree& tree) {
     const std::string found = text_of(LA_FULLFILE(other.c_str()).get_fullfile());
     EXPECT_TRUE(found.empty() || found == whole || whole.find("../") != whole.npos) << found;
   }
-  const std::size_t skipped = whole.starts_with(tree.home + "/") ? tree.home.size() + 1 : 0;
+  const std::string below = tree.home + "/";
+  const bool is_below = whole.starts_with(below) && !whole.starts_with(below + "/");
+  const std::size_t skipped = is_below ? below.size() : 0;
   const std::string argument = text_of(full.get_external_path());
   EXPECT_TRUE(argument.empty() || argument == '"' + whole.substr(skipped) + '"') << argument;
 }
