@@ -92,8 +92,13 @@ std::string_view StaticAcdRead::joined(std::string_view value, std::string_view 
 }
 
 std::string_view StaticAcdRead::value(std::string_view key) const {
+  // Most keys are asked for in the order of the file.
+  const std::size_t next = last_found_ + 1;
+  if (next < keys_.size() && keys_[next] == key) return values_[last_found_ = next];
   const int number = index_.find(la_hash(key), is_key(key));
-  return number != la_hash_index::NONE ? la_at(values_, number) : std::string_view();
+  if (number == la_hash_index::NONE) return {};
+  last_found_ = static_cast<std::size_t>(number);
+  return values_[last_found_];
 }
 
 Port::StringBase<char> StaticAcdRead::GetStringByKey(const char* key, const char* separator,

@@ -58,6 +58,7 @@ class StaticAcdRead {
   std::vector<std::string_view> keys_;
   std::vector<std::string_view> values_;  ///< of the same numbers
   la_hash_index index_;                   ///< of those numbers, by key
+  mutable std::size_t last_found_ = 0;
   std::string_view* last_value_ = nullptr;
   std::string_view passed_over_;  ///< the value of a key that stands earlier too
   bool valid_ = true;
