@@ -145,8 +145,14 @@ unsigned short result(const DARRAY_LA_STATUS_PTR& list, int exit_code) {
 }
 
 LA_FILE* set_file(std::optional<LA_FILE>& file, const char* text) {
-  file.reset();
-  return text != nullptr ? &file.emplace(text) : nullptr;
+  if (text == nullptr) {
+    file.reset();
+  } else if (file) {
+    file->set_file(text);  // The text may be a part of the file.
+  } else {
+    file.emplace(text);
+  }
+  return file ? &*file : nullptr;
 }
 
 const char* name_of(const std::unique_ptr<LA_DIR>& dir) {
