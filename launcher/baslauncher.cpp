@@ -336,11 +336,8 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
   std::vector<int> path;
   path.reserve(8);  // Few chains are longer.
   path.push_back(index->first_producer(wanted));
-  std::vector<bool> failed(index->num_spellings());
+  std::vector<char> failed(index->num_spellings());
   const auto try_next = [&path, this] { path.back() = index->next_producer(path.back()); };
-  const auto has_failed = [&failed, this](int rule) {
-    return failed[static_cast<std::size_t>(index->spelling(rule))];
-  };
 
   while (path.back() != la_rule_index::NONE || path.size() > 1) {
     if (is_interrupted(where.given)) return LA_FAILED;
@@ -358,7 +355,7 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
         return LA_FOUND;
       }
       note(needing, named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED : LA_EXPLANATION::NO_SOURCE);
-      has_failed(needing) = true;
+      la_at(failed, index->spelling(needing)) = true;
       try_next();
       continue;
     }
@@ -374,7 +371,7 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
     }
     const char* only_name = rule.netlist_file->get_name();
     const bool for_another = only_name != nullptr && !where.given.match_name(only_name);
-    if (for_another || has_failed(i)) {
+    if (for_another || la_at(failed, index->spelling(i))) {
       note(i, for_another   ? LA_EXPLANATION::FOR_ANOTHER_NAME
               : named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED
                             : LA_EXPLANATION::NO_SOURCE);

@@ -145,8 +145,14 @@ unsigned short result(const DARRAY_LA_STATUS_PTR& list, int exit_code) {
 }
 
 LA_FILE* set_file(std::optional<LA_FILE>& file, const char* text) {
-  file.reset();
-  return text != nullptr ? &file.emplace(text) : nullptr;
+  if (text == nullptr) {
+    file.reset();
+  } else if (file) {
+    file->set_file(text);  // The text may be a part of the file.
+  } else {
+    file.emplace(text);
+  }
+  return file ? &*file : nullptr;
 }
 
 const char* name_of(const std::unique_ptr<LA_DIR>& dir) {
@@ -322,13 +328,18 @@ bool check_rule(const LA_RULE& rule, const LA_KEYWORD_TABLE& table) {
   return good;
 }
 
+/// The hash of what two rules for the same conversion have in common.
+std::uint32_t hash_of_conversion(const LA_RULE& rule) {
+  // A dot may belong to the name as well.
+  std::uint32_t hash = la_hash(rule.netlist_file->get_name());
+  const char* ext = rule.netlist_file->get_ext();
+  if (ext != nullptr) hash = la_hash(ext, la_hash('.', hash));
+  return la_hash(rule.target->get_ext(), hash);
+}
+
 bool redefines(const LA_RULE& a, const LA_RULE& b) {
-  const auto match = [](const char* text, const char* other) {
-    return text == nullptr || other == nullptr ? text == other : UT_STR::ICompare(text, other) == 0;
-  };
-  return match(a.netlist_file->get_name(), b.netlist_file->get_name()) &&
-         match(a.netlist_file->get_ext(), b.netlist_file->get_ext()) &&
-         match(a.target->get_ext(), b.target->get_ext());
+  return a.netlist_file->match_tail(b.netlist_file->get_tail()) &&
+         a.target->match_ext(b.target->get_ext());
 }
 
 /// Reports every pair of rules for the same netlist file and target, the earlier rule first.
@@ -340,8 +351,7 @@ bool check_redefinitions(const DARRAY_LA_RULE_PTR& batch) {
     const LA_RULE& rule = *batch.elements[i];
     // A target without extension matches none.
     if (rule.target->get_ext() == nullptr) continue;
-    const char* name = rule.netlist_file->get_name();
-    int& same = last.place(la_hash(name, hash_of_extensions(rule)),
+    int& same = last.place(hash_of_conversion(rule),
                            [&](int other) { return redefines(rule, *batch.elements[other]); });
     if (same != la_hash_index::NONE) la_at(next, same) = i;
     same = i;

@@ -49,12 +49,6 @@ void clear_none(LA_RULE& rule) {
 
 }  // namespace
 
-std::uint32_t hash_of_extensions(const LA_RULE& rule) {
-  const char* from = rule.netlist_file->get_ext();
-  const char* to = rule.target->get_ext();
-  return la_hash(to, la_hash(from));
-}
-
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
   // From the last rule to the first: the next one for the same extensions is complete by then. What
   // it lacks has no later one either, or it is kept out.
@@ -65,7 +59,7 @@ void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
     const char* to = rule.target->get_ext();
     // A missing extension matches none.
     if (from != nullptr && to != nullptr) {
-      int& later = next.place(hash_of_extensions(rule), [&](int other) {
+      int& later = next.place(la_hash(to, la_hash(from)), [&](int other) {
         return rules.elements[other]->netlist_file->match_ext(from) &&
                rules.elements[other]->target->match_ext(to);
       });

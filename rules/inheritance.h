@@ -2,8 +2,6 @@
 #ifndef KESTREL_RULES_INHERITANCE_H
 #define KESTREL_RULES_INHERITANCE_H
 
-#include <cstdint>
-
 #include "rules/baslarules.h"
 
 /// Completes every rule from the later ones for the same pair of extensions: each field that it
@@ -11,8 +9,5 @@
 /// lacks, from the nearest that has the level, which gives its first. Options and checkers of
 /// "NONE" are then cleared. Takes time in proportion to the number of rules.
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules);
-
-/// A hash of the two extensions of a rule, either of which may be missing.
-std::uint32_t hash_of_extensions(const LA_RULE& rule);
 
 #endif

@@ -75,6 +75,7 @@ r\nr=.a,.k,d/x|s/,n,,,,,,0,,,,,,x        | r - Dependency file d/x is not a plai
 r,s\nr=.b,.k,,n,,,,,,0\ns=,none          | 594 s - NetlistFile is required.\n605 s - TargetExtension is required.\n632 s - Netlister is required.\n703 s - There must be at least one of the following: NetlisterSuccessStatus, NetlisterWarningStatus, or NetlisterFatalStatus.\n(0)
 r\nr=.a,.k,,n,,,,c,,x,!,1x,1 2,=,-       | 670 r - Invalid exit code for NetlisterSuccessStatus.\n682 r - Invalid exit code for NetlisterWarningStatus.\n694 r - Invalid exit code for NetlisterFatalStatus.\n703 r - There must be at least one of the following: NetlisterSuccessStatus, NetlisterWarningStatus, or NetlisterFatalStatus.\n715 r - Invalid exit code for CheckerSuccessStatus.\n727 r - Invalid exit code for CheckerWarningStatus.\n739 r - Invalid exit code for CheckerFatalStatus.\n749 r - There myst be at least one of the following: CheckerSuccessStatus, CheckerWarningStatus, or CheckerFatalStatus.\n(0)
 r,s\nr=.a,.k,,n,,,,,,0\ns=.A,.K,,n,,,,,,0 | Rule r redefines rule s\n(0)
+r,s\nr=t.a.,.k,,n,,,,,,0\ns=t.A,.k,,n,,,,,,0 | Rule r redefines rule s\n(0)
 r\n= x\nr=.a,.k,,n,,,,,,0                | "~/share/data/larules.acd", line 2: Expecting KEY = VALUE\n(0))");
   const std::string value(260, 'x');
   const std::string found = load("r\nr=.a,.k,," + value + ",,,,,,0") + load(value);
