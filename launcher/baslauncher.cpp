@@ -683,7 +683,8 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
 /// oldest time stamp that there is. Its content stays for whoever wants to look into it. The
 /// current directory is home.
 void LA_LAUNCHER::distrust(const char* output, const Port::FileStatus& before) {
-  const char* file = at_home(output);
+  // A netlister may have moved home, or put another directory in its place.
+  const char* file = status_of(output).exists ? output : at_home(output);
   const Port::FileStatus after = status_of(file);
   if (!after.exists || (before.exists && after.time == before.time)) return;
   if (Port::File::setoldest(file)) {
