@@ -19,9 +19,9 @@ class Stream {
  public:
   enum Access { READ = 1 };
 
-  /// Takes over the file descriptor, which stands at the start of a file of so many bytes, as far as
-  /// that is known: readall() makes room for these at once. A UTF-8 byte order mark at the start is
-  /// skipped.
+  /// Takes over the file descriptor, which stands at the start of a file of so many bytes, as far
+  /// as that is known: readall() makes room for these at once. A UTF-8 byte order mark at the start
+  /// is skipped.
   explicit Stream(int descriptor, std::size_t size = 0);
   Stream(const Stream&) = delete;
   Stream& operator=(const Stream&) = delete;
