@@ -220,6 +220,9 @@ int explain(settings& set) {
     return message.level != PORT_MSG_WARNING;
   });
   for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
+    // A warning is to stand with the explanation of its name.
+    if (i > 0) std::puts("");
+    std::fflush(stdout);
     LA_EXPLANATION why;
     launcher.explain_to(&why);
     char source[LA_MAX_PATH];
@@ -227,7 +230,6 @@ int explain(settings& set) {
     error.clear();
     const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
     console::flush();
-    if (i > 0) std::puts("");
     std::fputs(explained({set.names[i], result, netlist, error}, why).c_str(), stdout);
     status = worse(status, result);
   }

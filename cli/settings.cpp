@@ -46,7 +46,7 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.json = true; }},
     {nullptr, "--check", nullptr, "load and check the rules, resolve nothing",
      [](settings& to, const char*) { to.what = task::CHECK; }},
-    {nullptr, "--list-rules", nullptr, "print the completed rules (with --detail: every field)",
+    {nullptr, "--list-rules", nullptr, "print the completed rules (with --detail: field by field)",
      [](settings& to, const char*) { to.what = task::LIST_RULES; }},
     {nullptr, "--graph", nullptr, "print the rules as a graph for Graphviz",
      [](settings& to, const char*) { to.what = task::GRAPH; }},

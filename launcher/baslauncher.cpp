@@ -519,8 +519,9 @@ short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CO
       if (!shared) shared.emplace(*this);
       if (!run_netlister(step, *shared, top)) return LA_FAILED;
       step.decision = LA_BUILD_AFTER_REBUILD;
+      step.output_status = {};  // What was known of it is no longer true.
     }
-    step.input_status = step.output_status;
+    step.input_status = std::exchange(step.output_status, {});
   }
   UT_STR::Copy(netlist_path, step.output);
   netlist_seen = step.decision < LA_BUILD_UNDECIDED;
@@ -608,12 +609,8 @@ void LA_LAUNCHER::decide(build_step& step) const {
 /// Adds the step to the explanation.
 void LA_LAUNCHER::note(const build_step& step) const {
   if (explanation == nullptr) return;
-  // After a run, what was known of the files is no longer true.
-  const bool is_known = step.decision != LA_BUILD_AFTER_REBUILD;
-  const Port::FileStatus unknown;
   explanation->steps.push_back({step.rule, input_of(step).get_fullfile(), step.output,
-                                is_known ? step.input_status : unknown,
-                                is_known ? step.output_status : unknown, step.dependency,
+                                step.input_status, step.output_status, step.dependency,
                                 step.dependency_status, step.decision, ""});
 }
 
@@ -680,7 +677,8 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
 /// oldest time stamp that there is. Its content stays for whoever wants to look into it. The
 /// current directory is home.
 void LA_LAUNCHER::distrust(const char* output, const Port::FileStatus& before) {
-  const char* file = at_home(output);
+  // A netlister may have moved home, or put another directory in its place.
+  const char* file = status_of(output).exists ? output : at_home(output);
   const Port::FileStatus after = status_of(file);
   if (!after.exists || (before.exists && after.time == before.time)) return;
   if (Port::File::setoldest(file)) {

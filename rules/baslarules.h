@@ -117,7 +117,7 @@ class LA_RULE {
   unsigned short netlister_result(int exit_code) const;
   unsigned short checker_result(int exit_code) const;
 
-  /// Issues the rule as status messages: in one line, or every field.
+  /// Issues the rule as status messages: in one line, or field by field, without dependency files.
   void dump(bool detail) const;
 
   la_text rule_name;
