@@ -105,6 +105,13 @@ bool File::isdirectory(const char* path) {
   return ::stat(path, &found) == 0 && S_ISDIR(found.st_mode);
 }
 
+bool File::same(const char* path, const char* other) {
+  struct stat first = {};
+  struct stat second = {};
+  return ::stat(path, &first) == 0 && ::stat(other, &second) == 0 &&
+         first.st_dev == second.st_dev && first.st_ino == second.st_ino;
+}
+
 bool File::getdatetime(const char* path, __int64& time) {
   const FileStatus found = status(path);
   if (found.exists) time = found.time;

@@ -83,6 +83,8 @@ class File {
   static bool missing(const char* path);
   /// True when path is a directory.
   static bool isdirectory(const char* path);
+  /// Whether two names lead to the same file or directory.
+  static bool same(const char* path, const char* other);
   /// Sets time to the modification time of path, in nanoseconds since 1970. Returns false, and
   /// leaves time alone, when there is no such file.
   static bool getdatetime(const char* path, __int64& time);

@@ -154,9 +154,7 @@ struct LA_LAUNCHER::lookup {
 
 short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
                                 unsigned char top) {
-  home.set_dir(nullptr);
-  const char* current = home.get_dir();
-  home_name = current != nullptr ? current : "";
+  find_home();
   LA_FULLFILE given(home, name);
   bool named_kbc = false;
   if (given.match_ext("kbo")) {
@@ -186,6 +184,18 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
   return result;
 }
 
+/// Takes the current directory for home, if its name leads to it.
+void LA_LAUNCHER::find_home() {
+  home.set_dir(nullptr);
+  const char* name = home.get_dir();
+  if (name != nullptr && (home_name == name || Port::File::same(name, "."))) {
+    home_name = name;
+  } else {
+    home.set_dir();
+    home_name.clear();
+  }
+}
+
 /// Whether a netlist can be looked for by this name; if not, says why.
 bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
   const bool fits = UT_STR::Len(name) < LA_MAX_PATH;
@@ -196,8 +206,8 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
   if (fits && given.get_fullfile() != nullptr) return true;
   if (fits && home.get_dir() == nullptr) {
     message().issueError(
-        "Launcher: The current directory cannot be used for netlist \"%s\": it is gone, too long, "
-        "or has a backslash in its name.\n",
+        "Launcher: The current directory cannot be used for netlist \"%s\": it is gone, cannot be "
+        "reached by its full name, or that is too long or has a backslash.\n",
         name);
   } else {
     message().issueError(
@@ -507,7 +517,7 @@ short LA_LAUNCHER::build_chain(const found_file& source, const DARRAY_LA_RULE_CO
     if (step.output == nullptr) {
       message().issueError(
           "Launcher: The output of rule %s for %s has no name of at most %d characters in the "
-          "output directory.\n",
+          "output directory, or there is none.\n",
           rule->rule_name.get(), source.file.get_tail(), LA_MAX_PATH - 1);
       ++errors;
       return LA_FAILED;
@@ -650,8 +660,9 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
   auto& [directory, options] = shared;
   if (home.get_dir() == nullptr) {
     message().issueError(
-        "Launcher: The current directory is gone, too long, or has a backslash in its name: %s is "
-        "not run.\n",
+        "Launcher: The current directory is gone, cannot be reached by its full name, or that is "
+        "too "
+        "long or has a backslash: %s is not run.\n",
         step.rule->netlister.get());
     ++errors;
     return false;

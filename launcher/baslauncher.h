@@ -101,6 +101,7 @@ class LA_LAUNCHER {
  private:
   short find_disabled(const char* name, char* netlist_path);
   short find_enabled(const char* name, char* source_path, char* netlist_path, unsigned char top);
+  void find_home();
   bool is_usable(const LA_FULLFILE& given, const char* name);
   /// A file, and what was known of it when it was found.
   struct found_file {
@@ -162,7 +163,7 @@ class LA_LAUNCHER {
   /// Where this find looks for its name in the search directories; none before that is needed. Kept
   /// for the sake of its memory.
   std::vector<LA_FULLROOT> in_searchpaths;
-  LA_DIR home;            ///< the current directory when this find began
+  LA_DIR home;            ///< the current directory when this find began, if it can be used
   std::string home_name;  ///< its name, with "/" at its end; empty when it has none
   std::unique_ptr<LA_RULE_SET> rules;
   std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions

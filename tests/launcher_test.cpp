@@ -302,7 +302,7 @@ TEST(Plan, AsksForEachFileOnce) {
   const char* dirs[] = {"r", "s", "t"};
   LA_LAUNCHER launcher(nullptr, dirs, 3, nullptr, 0, nullptr, nullptr, 0, 0, 0, 0, 0, 0);
   for (const auto& row : table(R"(
-up     | 0 1 7 1   | source 4, outputs 2, dependency 1
+up     | 0 1 9 1   | the current directory 2, once; source 4, outputs 2, dependency 1
 up.sch | 0 1 7 1   | the same
 one    | 0 0 10 3  | sources 8, output 1, and 1 before it is made; names in the command 2
 two    | 0 0 7 5   | source 4, output 1, and 2 before they are made; names in the commands 4
@@ -461,7 +461,7 @@ RULES=a,b; a=.edf,.kbo,,nl,,$infile,,,,0; b=.verilog,.kbo,,nl,,$infile,w,,,0
 <255>.edf        | -n <255>.edf  | run "<255>.edf", 0 ~/<255>.edf ~/<255>.kbo
                  | <256>.edf <999> | E Launcher: The full name of netlist "<256>.edf" is longer than 259 characters., -1 E1, E Launcher: The full name of netlist "<999>" is longer than 259 characters., -1 E2
 <256>.edf s/     | -n -sd s <256> | 1
-<255>.edf o/     | -n -o o <255> | E Launcher: The output of rule a for <255>.edf has no name of at most 259 characters in the output directory., -1 E1
+<255>.edf o/     | -n -o o <255> | E Launcher: The output of rule a for <255>.edf has no name of at most 259 characters in the output directory, or there is none., -1 E1
 <251>.verilog w/ | <251>         | E Launcher: The name of <251>.verilog is too long for a command line., -1 E1
 d.kbc            | -u <999> -sd <259> -sd <260> -sd // d | E Launcher: User rules file name "<999>" is longer than 259 characters., not ok, 0 ~/d.kbc ~/d.kbc
 )";
