@@ -1,7 +1,9 @@
 #include "cli/console.h"
 
+#include <poll.h>
 #include <unistd.h>
 
+#include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <utility>
@@ -30,14 +32,16 @@ constexpr appearance appearance_of(Port_MsgLevel level) {
   }
 }
 
+/// What is still to be written to standard error.
+std::string waiting;
+constexpr std::size_t BLOCK = 65536;
+
 }  // namespace
 
 console::console(bool debug)
     : is_terminal_(::isatty(STDERR_FILENO) != 0),
       colour_(is_terminal_ && std::getenv("NO_COLOR") == nullptr),
       before_(Port_MsgManData::setSink({show, this, debug})) {
-  static char buffer[65536];
-  std::setvbuf(stderr, buffer, is_terminal_ ? _IOLBF : _IOFBF, sizeof buffer);
   Port_MsgManData::setFlush([](void* /*context*/) { flush(); }, nullptr);
 }
 
@@ -47,19 +51,38 @@ console::~console() {
   flush();
 }
 
+void console::say(std::string_view text) {
+  waiting += text;
+  if (waiting.size() >= BLOCK) flush();
+}
+
 void console::flush() {
-  std::fflush(stderr);
+  for (std::string_view rest = waiting; !rest.empty();) {
+    const ssize_t written = ::write(STDERR_FILENO, rest.data(), rest.size());
+    if (written >= 0) {
+      rest.remove_prefix(static_cast<std::size_t>(written));
+    } else if (errno == EAGAIN) {
+      // Whoever else writes there may have asked not to wait.
+      pollfd place = {STDERR_FILENO, POLLOUT, 0};
+      ::poll(&place, 1, -1);
+    } else if (errno != EINTR) {
+      break;
+    }
+  }
+  waiting.clear();
 }
 
 void console::show(void* self, const Port_Msg& message) {
+  const auto& [is_terminal, colour, before] = *static_cast<console*>(self);
   const appearance look = appearance_of(message.level);
-  const bool coloured = static_cast<console*>(self)->colour_ && *look.prefix != '\0';
-  if (coloured) std::fputs(look.colour, stderr);
-  std::fputs(look.prefix, stderr);
-  if (coloured) std::fputs("\033[0m", stderr);
+  const bool coloured = colour && *look.prefix != '\0';
+  if (coloured) say(look.colour);
+  say(look.prefix);
+  if (coloured) say("\033[0m");
   const std::string_view text = message.text;
-  std::fwrite(text.data(), 1, text.size(), stderr);
-  if (!text.ends_with('\n')) std::fputc('\n', stderr);
+  say(text);
+  if (!text.ends_with('\n')) say("\n");
+  if (is_terminal) flush();
 }
 
 diversion::diversion(std::function<bool(const Port_Msg&)> take)
@@ -79,7 +102,7 @@ void complain(const std::string& text) {
 }
 
 void complain(const std::vector<std::string>& texts) {
-  for (const std::string& text : texts) std::fprintf(stderr, "kestrel-launch: %s\n", text.c_str());
+  for (const std::string& text : texts) console::say("kestrel-launch: " + text + "\n");
   console::flush();
 }
 

@@ -19,6 +19,8 @@ class console {
   console& operator=(const console&) = delete;
   ~console();
 
+  /// Adds to what waits.
+  static void say(std::string_view text);
   /// Writes what waits. To be called before something is written to standard output.
   static void flush();
   /// Whether standard error is a terminal.

@@ -187,6 +187,7 @@ int resolve(settings& set, const console& shown) {
   for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
     const std::string& name = set.names[i];
     if (shown.is_terminal() && set.names.size() > 1) {
+      // On a terminal nothing waits to be written.
       std::fprintf(stderr, "[%zu/%zu] %s\n", i + 1, set.names.size(), name.c_str());
     }
     char source[LA_MAX_PATH];
@@ -331,7 +332,8 @@ int run_command_line(int count, const char* const* words) {
   if (wrong.empty() && resolves) wrong = complete(set);
   if (!wrong.empty()) {
     complain(wrong);
-    std::fputs("Try 'kestrel-launch --help'.\n", stderr);
+    console::say("Try 'kestrel-launch --help'.\n");
+    console::flush();
     return FAILED;
   }
   const int status = run(set);
