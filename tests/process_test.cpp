@@ -1,12 +1,15 @@
 // The launcher as a guest of its process: what it leaves as it was, and how it is interrupted.
+#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <poll.h>
 #include <signal.h>
+#include <sys/ioctl.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <clocale>
 #include <filesystem>
 #include <set>
@@ -154,6 +157,32 @@ TEST_F(Guest, ACommandShowsMessagesInOrderAndAtOnce) {
     ::kill(launch, SIGTERM);
   });
   EXPECT_EQ(seen, again + "Launcher: Executing nl say=now out=\"d.kbo\" sleep=60000\nnow\n");
+}
+
+// Whoever shares its standard error has asked not to wait there, and reads late.
+TEST_F(Guest, ACommandLosesNothingWhereItMayNotWait) {
+  std::string names;
+  for (int i = 0; i < 5000; ++i) names += "nowhere\n";
+  tree.write("names", names);
+  int ends[2];
+  ASSERT_EQ(::pipe(ends), 0);
+  ASSERT_LT(ends[1], 10);  // The shell takes one digit.
+  ::fcntl(ends[1], F_SETFL, O_NONBLOCK);
+  std::string said;
+  const std::string command = KESTREL_LAUNCH, to = " --names-from names 2>&";
+  run({"/bin/sh", "-c", "exec " + command + to + std::to_string(ends[1])}, [&](pid_t) {
+    ::close(ends[1]);
+    int waiting = 0;
+    for (int i = 0; i < 20'000 && waiting < 60'000; ++i, ::usleep(1000)) {
+      ::ioctl(ends[0], FIONREAD, &waiting);
+    }
+    char block[4096];
+    for (ssize_t length; (length = ::read(ends[0], block, sizeof block)) > 0;) {
+      said.append(block, static_cast<std::size_t>(length));
+    }
+  });
+  ::close(ends[0]);
+  EXPECT_EQ(std::count(said.begin(), said.end(), '\n'), 5001);
 }
 
 // The signals come when the last netlister of a chain has begun to write its output.
