@@ -4,30 +4,9 @@
 #include <cstdint>
 #include <map>
 
-#include "host/hash_index.h"
+#include "host/text_numbers.h"
 
 namespace {
-
-/// Numbers texts from 0 on. The case of letters does not count, and an absent text is an empty one.
-class numbering {
- public:
-  std::size_t number_of(const char* text) {
-    if (text == nullptr) text = "";
-    int& number = index_.place(la_hash(text), [&](int known) {
-      return UT_STR::ICompare(la_at(texts_, known), text) == 0;
-    });
-    if (number == la_hash_index::NONE) {
-      number = static_cast<int>(texts_.size());
-      texts_.push_back(text);
-    }
-    return static_cast<std::size_t>(number);
-  }
-  std::size_t count() const { return texts_.size(); }
-
- private:
-  std::vector<const char*> texts_;
-  la_hash_index index_;
-};
 
 /// A rule by numbers: of its kinds, source and target, and of the only name that it is for.
 using numbered_rule = std::array<std::size_t, 3>;
@@ -101,8 +80,8 @@ std::string kind_of(const LA_FILE& file) {
 }
 
 std::vector<relation> relations_of(const LA_RULE_SET& set) {
-  numbering kinds;
-  numbering names;
+  la_text_numbers<UT_STR::ICompare> kinds;
+  la_text_numbers<UT_STR::ICompare> names;
   const std::size_t native = kinds.number_of("kbo");
   const std::size_t any_name = names.number_of(nullptr);
   std::vector<numbered_rule> rules;

@@ -365,7 +365,7 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
         return LA_FOUND;
       }
       note(needing, named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED : LA_EXPLANATION::NO_SOURCE);
-      la_at(failed, index->spelling(needing)) = true;
+      failed[index->spelling(needing)] = true;
       try_next();
       continue;
     }
@@ -381,7 +381,7 @@ short LA_LAUNCHER::plan_chain(lookup& where, const char* wanted, unsigned char* 
     }
     const char* only_name = rule.netlist_file->get_name();
     const bool for_another = only_name != nullptr && !where.given.match_name(only_name);
-    if (for_another || la_at(failed, index->spelling(i))) {
+    if (for_another || failed[index->spelling(i)]) {
       note(i, for_another   ? LA_EXPLANATION::FOR_ANOTHER_NAME
               : named_found ? LA_EXPLANATION::NOT_WHAT_IS_NAMED
                             : LA_EXPLANATION::NO_SOURCE);
