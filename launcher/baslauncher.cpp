@@ -759,8 +759,7 @@ bool LA_LAUNCHER::make_command(const LA_RULE& rule, const LA_FULLFILE& input,
   options.set_name("outfile", outfile);
 
   char expanded[LA_MAX_OPTIONS];
-  UT_STR::Copy(expanded, options_template, sizeof expanded);
-  if (!options.expand(expanded)) {
+  if (!options.expand(options_template, expanded)) {
     message().issueError("Could not expand option string \"%s\"\n", expanded);
     errors += 2;
     return false;

@@ -49,8 +49,8 @@ std::string la_command_options::stand_in_for(const std::string& name, std::size_
   return text;
 }
 
-unsigned char la_command_options::expand(char* options) const {
-  return real_.expand(options, LA_MAX_OPTIONS);
+unsigned char la_command_options::expand(const char* options_template, char* result) const {
+  return real_.expand(options_template, result, LA_MAX_OPTIONS);
 }
 
 std::string la_command_options::with_names(std::string word) const {

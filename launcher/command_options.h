@@ -26,8 +26,8 @@ class la_command_options {
   /// Adds a name to the values of a keyword.
   void add_name(const char* keyword, const std::string& name);
 
-  /// Expands a template in a buffer of LA_MAX_OPTIONS characters, as LA_KEYWORD_TABLE does.
-  unsigned char expand(char* options) const;
+  /// Expands a template into a buffer of LA_MAX_OPTIONS characters, as LA_KEYWORD_TABLE does.
+  unsigned char expand(const char* options_template, char* result) const;
   /// Whether a command line, made of start and the expanded template, splits into the words that
   /// the template's author meant. If not, something in a name - a quote, or a blank where the
   /// template does not quote it - would make or change an argument.
