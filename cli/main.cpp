@@ -187,8 +187,11 @@ int resolve(settings& set, const console& shown) {
   for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
     const std::string& name = set.names[i];
     if (shown.is_terminal() && set.names.size() > 1) {
-      // On a terminal nothing waits to be written.
-      std::fprintf(stderr, "[%zu/%zu] %s\n", i + 1, set.names.size(), name.c_str());
+      const std::string number = std::to_string(i + 1) + "/" + std::to_string(set.names.size());
+      for (const std::string_view piece : {"[", number.c_str(), "] ", name.c_str(), "\n"}) {
+        console::say(piece);
+      }
+      console::flush();
     }
     char source[LA_MAX_PATH];
     char netlist[LA_MAX_PATH];

@@ -184,16 +184,17 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
   return result;
 }
 
-/// Takes the current directory for home, if its name leads to it.
+/// Takes the current directory for home. Files below it are asked for by relative names if its name
+/// leads to it: a netlister may have seen to it that it does not any more.
 void LA_LAUNCHER::find_home() {
   home.set_dir(nullptr);
   const char* name = home.get_dir();
-  if (name != nullptr && (home_name == name || Port::File::same(name, "."))) {
-    home_name = name;
-  } else {
-    home.set_dir();
+  if (name == nullptr) {
     home_name.clear();
+  } else if (home_name != name || home_runs != runs) {
+    home_name = Port::File::same(name, ".") ? name : "";
   }
+  home_runs = runs;
 }
 
 /// Whether a netlist can be looked for by this name; if not, says why.
@@ -206,8 +207,8 @@ bool LA_LAUNCHER::is_usable(const LA_FULLFILE& given, const char* name) {
   if (fits && given.get_fullfile() != nullptr) return true;
   if (fits && home.get_dir() == nullptr) {
     message().issueError(
-        "Launcher: The current directory cannot be used for netlist \"%s\": it is gone, cannot be "
-        "reached by its full name, or that is too long or has a backslash.\n",
+        "Launcher: The current directory cannot be used for netlist \"%s\": it is gone, too long, "
+        "or has a backslash in its name.\n",
         name);
   } else {
     message().issueError(
@@ -660,9 +661,8 @@ bool LA_LAUNCHER::run_netlister(const build_step& step, shared_by_runs& shared, 
   auto& [directory, options] = shared;
   if (home.get_dir() == nullptr) {
     message().issueError(
-        "Launcher: The current directory is gone, cannot be reached by its full name, or that is "
-        "too "
-        "long or has a backslash: %s is not run.\n",
+        "Launcher: The current directory is gone, too long, or has a backslash in its name: %s is "
+        "not run.\n",
         step.rule->netlister.get());
     ++errors;
     return false;

@@ -163,8 +163,10 @@ class LA_LAUNCHER {
   /// Where this find looks for its name in the search directories; none before that is needed. Kept
   /// for the sake of its memory.
   std::vector<LA_FULLROOT> in_searchpaths;
-  LA_DIR home;            ///< the current directory when this find began, if it can be used
-  std::string home_name;  ///< its name, with "/" at its end; empty when it has none
+  LA_DIR home;  ///< the current directory when this find began
+  /// Its name, with "/" at its end; empty when it has none that leads to it.
+  std::string home_name;
+  int home_runs = 0;  ///< the runs before that was seen
   std::unique_ptr<LA_RULE_SET> rules;
   std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions
   LA_EXPLANATION* explanation = nullptr;
