@@ -3,6 +3,7 @@ include(CMakePackageConfigHelpers)
 
 set(KESTREL_HEADERS
   file/baslafile.h
+  host/arena.h
   host/port_file.h
   host/port_interrupt.h
   host/port_msgman.h

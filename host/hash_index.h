@@ -2,6 +2,7 @@
 #ifndef KESTREL_HOST_HASH_INDEX_H
 #define KESTREL_HOST_HASH_INDEX_H
 
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
@@ -36,6 +37,11 @@ auto& la_at(Table& table, int number) {
 class la_hash_index {
  public:
   static constexpr int NONE = -1;
+
+  la_hash_index() = default;
+  /// With room for so many numbers.
+  explicit la_hash_index(int count)
+      : slots_(std::bit_ceil(2 * static_cast<std::size_t>(count) + 1)) {}
 
   /// The number under this hash for which is_it(number) holds, or NONE.
   template <class Test>

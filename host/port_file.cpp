@@ -68,8 +68,8 @@ int Stream::readline(char* buffer, int size) {
   return length;
 }
 
-std::string Stream::readall() {
-  std::string text;
+la_long_string Stream::readall() {
+  la_long_string text;
   text.reserve(size_);
   for (; !geteof(); fill()) text.append(next_, end_);
   return text;

@@ -33,7 +33,7 @@ class Stream {
   /// line holds a zero byte.
   int readline(char* buffer, int size);
   /// All that has not been read yet.
-  std::string readall();
+  la_long_string readall();
   /// True once every line has been read, or reading failed.
   bool geteof() const { return next_ == end_; }
   /// True when the file could not be read to its end.

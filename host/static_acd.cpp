@@ -74,9 +74,8 @@ bool StaticAcdRead::read_line(std::string_view line) {
   int& known = index_.place(la_hash(key), is_key(key));
   last_value_ = &passed_over_;
   if (known == la_hash_index::NONE) {
-    known = static_cast<int>(keys_.size());
-    keys_.push_back(key);
-    last_value_ = &values_.emplace_back();
+    known = static_cast<int>(entries_.size());
+    last_value_ = &entries_.emplace_back(key).value;
   }
   *last_value_ = la_trimmed(content.substr(equals + 1));
   return true;
@@ -94,11 +93,12 @@ std::string_view StaticAcdRead::joined(std::string_view value, std::string_view 
 std::string_view StaticAcdRead::value(std::string_view key) const {
   // Most keys are asked for in the order of the file.
   const std::size_t next = last_found_ + 1;
-  if (next < keys_.size() && keys_[next] == key) return values_[last_found_ = next];
+  if (next < entries_.size() && entries_[next].key == key)
+    return entries_[last_found_ = next].value;
   const int number = index_.find(la_hash(key), is_key(key));
   if (number == la_hash_index::NONE) return {};
   last_found_ = static_cast<std::size_t>(number);
-  return values_[last_found_];
+  return entries_[last_found_].value;
 }
 
 Port::StringBase<char> StaticAcdRead::GetStringByKey(const char* key, const char* separator,

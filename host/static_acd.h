@@ -3,9 +3,9 @@
 #define KESTREL_HOST_STATIC_ACD_H
 
 #include <cstddef>
+#include <deque>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "host/blanks.h"
 #include "host/hash_index.h"
@@ -17,6 +17,11 @@
 /// of two equal keys counts. Line ends may be "\n" or "\r\n"; a byte order mark is skipped.
 class StaticAcdRead {
  public:
+  struct entry {
+    std::string_view key;
+    std::string_view value;
+  };
+
   /// Reads the file at path; a missing one holds no keys. A file that cannot be read holds none
   /// either, and a line that is not of the form above is passed over: both are reported as errors
   /// and make valid() false. The other arguments are not used.
@@ -41,8 +46,8 @@ class StaticAcdRead {
     text = end == text.npos ? std::string_view() : text.substr(end + 1);
     return piece;
   }
-  /// All keys, in the order of the file; good as long as this object.
-  const std::vector<std::string_view>& keys() const { return keys_; }
+  /// All keys and their values, in the order of the file.
+  const std::deque<entry>& entries() const { return entries_; }
   /// False when something of the file could not be read or understood.
   bool valid() const { return valid_; }
 
@@ -50,14 +55,13 @@ class StaticAcdRead {
   /// False when the line is not of the form above; it is then passed over.
   bool read_line(std::string_view line);
   auto is_key(std::string_view key) const {
-    return [this, key](int number) { return la_at(keys_, number) == key; };
+    return [this, key](int number) { return la_at(entries_, number).key == key; };
   }
   std::string_view joined(std::string_view value, std::string_view content);
 
-  std::string text_;  ///< the file, with the lines of a value joined where the first stands
-  std::vector<std::string_view> keys_;
-  std::vector<std::string_view> values_;  ///< of the same numbers
-  la_hash_index index_;                   ///< of those numbers, by key
+  la_long_string text_;  ///< the file, with the lines of a value joined where the first stands
+  std::deque<entry> entries_;
+  la_hash_index index_;  ///< of the entries, by key
   mutable std::size_t last_found_ = 0;
   std::string_view* last_value_ = nullptr;
   std::string_view passed_over_;  ///< the value of a key that stands earlier too

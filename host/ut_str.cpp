@@ -124,7 +124,7 @@ int UT_STR::IsAlpha(int c) {
   return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
 }
 
-la_text::la_text(const char* chars, std::size_t length) {
+la_text::la_text(const char* chars, std::size_t length, la_arena* memory) {
   if (chars == nullptr) {
     room_[LAST] = ABSENT;
     return;
@@ -133,9 +133,9 @@ la_text::la_text(const char* chars, std::size_t length) {
   if (length < SIZE) {
     room_[LAST] = IN_PLACE;
   } else {
-    to = new char[length + 1];
+    to = memory != nullptr ? static_cast<char*>(memory->take(length + 1, 1)) : new char[length + 1];
     std::memcpy(room_, &to, sizeof to);
-    room_[LAST] = ELSEWHERE;
+    room_[LAST] = memory != nullptr ? IN_ARENA : ELSEWHERE;
   }
   std::memcpy(to, chars, length);
   to[length] = '\0';

@@ -6,6 +6,8 @@
 #include <cstddef>
 #include <cstring>
 
+#include "host/arena.h"
+
 /// Length, terminator included, of every fixed path buffer.
 constexpr int LA_MAX_PATH = 260;
 
@@ -63,7 +65,11 @@ class la_text {
   /// A copy of chars; null makes an absent text.
   la_text(const char* chars) : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0) {}
   /// A copy of so many of chars; null makes an absent text.
-  la_text(const char* chars, std::size_t length);
+  la_text(const char* chars, std::size_t length) : la_text(chars, length, nullptr) {}
+  /// A copy of chars that lies in memory when it is long, and must not outlive it then; nor must
+  /// what it is moved to. Null makes an absent text.
+  la_text(const char* chars, la_arena& memory)
+      : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0, &memory) {}
   la_text(const la_text& other) : la_text(other.get()) {}
   la_text(la_text&& other) noexcept { take(other); }
   la_text& operator=(const la_text& other) { return *this = la_text(other); }
@@ -85,9 +91,11 @@ class la_text {
 
  private:
   /// What the last character of the room says; that of a string that fills it is its terminator.
-  enum : char { IN_PLACE = 0, ABSENT = 1, ELSEWHERE = 2 };
+  enum : char { IN_PLACE = 0, ABSENT = 1, ELSEWHERE = 2, IN_ARENA = 3 };
   static constexpr std::size_t SIZE = 16;
   static constexpr std::size_t LAST = SIZE - 1;
+
+  la_text(const char* chars, std::size_t length, la_arena* memory);
 
   char* elsewhere() const noexcept {
     char* chars;

@@ -77,13 +77,6 @@ void LA_STATUS::dump() const {
   message().issueStatus("%s status %s %d\n", level_word(level), SYMBOLS[op], code);
 }
 
-LA_STATUS* LA_STATUS_STORE::keep(const LA_STATUS& entry) {
-  for (std::optional<LA_STATUS>& place : few) {
-    if (!place) return &place.emplace(entry);
-  }
-  return &more.emplace_front(entry);
-}
-
 bool parse_status(const char* text, unsigned short& op, int& code) {
   op = OP_NOVALUE;
   code = 0;
@@ -165,8 +158,15 @@ const char* name_of(const std::optional<LA_FILE>& file) {
 
 }  // namespace
 
-LA_RULE::LA_RULE(const char* rule_name)
-    : rule_name(rule_name), netlister_status(3), checker_status(3) {}
+LA_RULE::LA_RULE(const char* rule_name) : LA_RULE(rule_name, std::make_unique<la_arena>()) {}
+
+LA_RULE::LA_RULE(const char* rule_name, std::unique_ptr<la_arena> own_memory)
+    : LA_RULE(rule_name, *own_memory) {
+  own_memory_ = std::move(own_memory);
+}
+
+LA_RULE::LA_RULE(const char* rule_name, la_arena& memory)
+    : rule_name(rule_name, memory), netlister_status(3), checker_status(3), memory_(memory) {}
 
 LA_RULE::~LA_RULE() {
   if (dependency_files) {
@@ -221,11 +221,11 @@ void LA_RULE::set_checker_dir(const char* text) {
 }
 
 void LA_RULE::add_netlister_status(const LA_STATUS& entry) {
-  netlister_status.append(statuses.keep(entry));
+  netlister_status.append(memory_.make<LA_STATUS>(entry));
 }
 
 void LA_RULE::add_checker_status(const LA_STATUS& entry) {
-  checker_status.append(statuses.keep(entry));
+  checker_status.append(memory_.make<LA_STATUS>(entry));
 }
 
 bool LA_RULE::add_netlister_status(unsigned short level, const char* text) {
@@ -346,7 +346,7 @@ bool redefines(const LA_RULE& a, const LA_RULE& b) {
 bool check_redefinitions(const DARRAY_LA_RULE_PTR& batch) {
   // For each rule, the next one for the same conversion.
   std::vector<int> next(static_cast<std::size_t>(batch.count), batch.count);
-  la_hash_index last;
+  la_hash_index last(batch.count);
   for (int i = 0; i < batch.count; ++i) {
     const LA_RULE& rule = *batch.elements[i];
     // A target without extension matches none.
@@ -383,16 +383,21 @@ bool validate_rules(const DARRAY_LA_RULE_PTR& batch) {
 
 namespace {
 
+struct destroy_rule {
+  void operator()(LA_RULE* rule) const { std::destroy_at(rule); }
+};
+using owned_rule = std::unique_ptr<LA_RULE, destroy_rule>;
+
 /// Rules on their way into the rule set; those that do not get there are destroyed.
 struct rule_batch {
   rule_batch() = default;
   rule_batch(const rule_batch&) = delete;
   rule_batch& operator=(const rule_batch&) = delete;
   ~rule_batch() {
-    for (LA_RULE* rule : rules) delete rule;
+    for (LA_RULE* rule : rules) std::destroy_at(rule);
   }
 
-  void add(std::unique_ptr<LA_RULE> rule) {
+  void add(owned_rule rule) {
     rules.append(nullptr);
     rules.elements[rules.count - 1] = rule.release();
   }
@@ -500,8 +505,8 @@ static_assert(LA_MAX_PATH == 260 && la_statement_reader::MAX_LINES == 32767);
 
 class user_rules_loader {
  public:
-  user_rules_loader(const char* file_name, Port::Stream& stream)
-      : file_name_(file_name), reader_(stream) {}
+  user_rules_loader(const char* file_name, Port::Stream& stream, la_arena& memory)
+      : file_name_(file_name), reader_(stream), memory_(memory) {}
 
   /// Reads the whole file into rules. Returns whether there was no error.
   bool read() {
@@ -533,7 +538,7 @@ class user_rules_loader {
   void take_statement(std::string_view keyword, const char* value) {
     if (is_same(keyword, "RuleName")) {
       finish_rule();
-      rule_ = std::make_unique<LA_RULE>(value);
+      rule_.reset(memory_.make<LA_RULE>(value, memory_));
       return;
     }
     if (!rule_) return report("%s", "Rule does not have a RuleName");
@@ -560,7 +565,8 @@ class user_rules_loader {
   const char* file_name_;
   la_statement_reader reader_;
   bool good_ = true;
-  std::unique_ptr<LA_RULE> rule_;
+  la_arena& memory_;
+  owned_rule rule_;
   rule_batch named_;
   rule_batch extension_;
 };
@@ -598,7 +604,7 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
     message().issueError("Launcher: Could not open user rules file \"%s\".\n", file_name);
     return false;
   }
-  user_rules_loader loader(file_name, *stream);
+  user_rules_loader loader(file_name, *stream, memory_);
   const bool good = loader.read() && loader.validate();
   loader.move_to(rules);
   add_file(file.get_fullfile());
@@ -626,7 +632,8 @@ std::string system_rules_file(PM_PIC& device) {
 
 class system_rules_loader {
  public:
-  explicit system_rules_loader(const char* path) : reader_(path, nullptr, nullptr, 1, 0, 1) {}
+  system_rules_loader(const char* path, la_arena& memory)
+      : reader_(path, nullptr, nullptr, 1, 0, 1), memory_(memory) {}
 
   /// Reads all rules. Returns whether there was no error.
   bool read() {
@@ -649,7 +656,7 @@ class system_rules_loader {
 
  private:
   void read_rule(const char* name) {
-    auto rule = std::make_unique<LA_RULE>(name);
+    owned_rule rule(memory_.make<LA_RULE>(name, memory_));
     if (UT_STR::Len(name) >= LA_MAX_PATH) refuse_length(name, "The name");
     record_.assign(reader_.value(name));
     std::string_view record = record_;
@@ -726,6 +733,7 @@ class system_rules_loader {
   }
 
   StaticAcdRead reader_;
+  la_arena& memory_;
   std::string record_;  ///< of the current rule, to be cut into its fields
   bool good_ = true;
   rule_batch batch_;
@@ -746,7 +754,7 @@ bool LA_RULE_SET::load_system_rules(const char* part_name) {
   }
   const std::string path = system_rules_file(*device);
   device.reset();
-  system_rules_loader loader(path.c_str());
+  system_rules_loader loader(path.c_str(), memory_);
   if (!loader.read() || !loader.validate()) return false;
   loader.move_to(rules);
   add_file(path);
@@ -771,7 +779,7 @@ LA_RULE_SET::LA_RULE_SET(const char* part_name, const char* user_rules_file) : r
 }
 
 LA_RULE_SET::~LA_RULE_SET() {
-  for (LA_RULE* rule : rules) delete rule;
+  for (LA_RULE* rule : rules) std::destroy_at(rule);
 }
 
 bool LA_RULE_SET::load(const char* part_name, const char* user_rules_file) {

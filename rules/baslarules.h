@@ -3,14 +3,13 @@
 #ifndef KESTREL_RULES_BASLARULES_H
 #define KESTREL_RULES_BASLARULES_H
 
-#include <array>
-#include <forward_list>
 #include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "file/baslafile.h"
+#include "host/arena.h"
 #include "host/ut_darray.h"
 #include "host/ut_str.h"
 
@@ -56,17 +55,6 @@ class LA_STATUS {
 /// code 0, for anything else (null included, which gives OP_NOVALUE).
 bool parse_status(const char* text, unsigned short& op, int& code);
 
-/// Keeps the entries of a rule: the first few, which is all that most rules have, in place.
-class LA_STATUS_STORE {
- public:
-  /// A copy of entry, good as long as this object.
-  LA_STATUS* keep(const LA_STATUS& entry);
-
- private:
-  std::array<std::optional<LA_STATUS>, 3> few;
-  std::forward_list<LA_STATUS> more;
-};
-
 using DARRAY_LA_STATUS_PTR = UT_TYPED_DARRAY<LA_STATUS*>;
 using DARRAY_LA_FILE_PTR = UT_TYPED_DARRAY<LA_FILE*>;
 
@@ -75,6 +63,8 @@ class LA_RULE {
  public:
   /// A rule with a copy of this name and nothing else.
   explicit LA_RULE(const char* rule_name);
+  /// Likewise. Texts and exit-status entries lie in memory, which must outlive the rule.
+  LA_RULE(const char* rule_name, la_arena& memory);
   LA_RULE(const LA_RULE&) = delete;
   LA_RULE& operator=(const LA_RULE&) = delete;
   ~LA_RULE();
@@ -92,11 +82,17 @@ class LA_RULE {
   bool has_dependency_files() const { return dependency_files && dependency_files->count > 0; }
 
   /// Replace the text by a copy; null removes it. They return the new text, which the rule owns.
-  const char* set_netlister(const char* text) { return netlister = text; }
-  const char* set_netlister_top_options(const char* text) { return netlister_top_options = text; }
-  const char* set_netlister_options(const char* text) { return netlister_options = text; }
-  const char* set_checker(const char* text) { return checker = text; }
-  const char* set_checker_options(const char* text) { return checker_options = text; }
+  const char* set_netlister(const char* text) { return netlister = la_text(text, memory_); }
+  const char* set_netlister_top_options(const char* text) {
+    return netlister_top_options = la_text(text, memory_);
+  }
+  const char* set_netlister_options(const char* text) {
+    return netlister_options = la_text(text, memory_);
+  }
+  const char* set_checker(const char* text) { return checker = la_text(text, memory_); }
+  const char* set_checker_options(const char* text) {
+    return checker_options = la_text(text, memory_);
+  }
 
   /// Store a copy of dir, or none for null, and the flag as it is.
   void set_netlister_dir(const LA_DIR* dir, unsigned short flag);
@@ -137,7 +133,10 @@ class LA_RULE {
   DARRAY_LA_STATUS_PTR checker_status;
 
  private:
-  LA_STATUS_STORE statuses;
+  LA_RULE(const char* rule_name, std::unique_ptr<la_arena> own_memory);
+
+  std::unique_ptr<la_arena> own_memory_;
+  la_arena& memory_;
 };
 
 using DARRAY_LA_RULE_PTR = UT_TYPED_DARRAY<LA_RULE*>;
@@ -181,6 +180,8 @@ class LA_RULE_SET {
   bool load_user_rules(const char* file_name);
   bool load_system_rules(const char* part_name);
   bool check_rules();
+
+  la_arena memory_;  ///< of the rules
 };
 
 #endif

@@ -52,7 +52,7 @@ void clear_none(LA_RULE& rule) {
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
   // From the last rule to the first: the next one for the same extensions is complete by then. What
   // it lacks has no later one either, or it is kept out.
-  la_hash_index next;
+  la_hash_index next(rules.count);
   for (int i = rules.count - 1; i >= 0; --i) {
     LA_RULE& rule = *rules.elements[i];
     const char* from = rule.netlist_file->get_ext();
