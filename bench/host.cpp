@@ -73,8 +73,7 @@ const char* values[NUM_KEYWORDS];
 char expanded[LA_MAX_PATH];
 
 void by_library(const LA_KEYWORD_TABLE& table) {
-  std::memcpy(expanded, TEMPLATE, sizeof TEMPLATE);
-  table.expand(expanded);
+  table.expand(TEMPLATE, expanded, LA_MAX_PATH);
 }
 
 char* put(char* to, std::string_view text) {
