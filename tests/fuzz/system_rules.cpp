@@ -16,7 +16,8 @@ void examine(const std::string& input, Tree& tree) {
     // The fields are all of the value but blanks and commas.
     std::string fields;
     for (std::size_t i = 0; i <= value.size(); ++i) {
-      fields += reader.GetStringByKey(each.key.data(), ",", static_cast<short>(i), nullptr, 0).c_str();
+      fields +=
+          reader.GetStringByKey(each.key.data(), ",", static_cast<short>(i), nullptr, 0).c_str();
     }
     EXPECT_TRUE(replaced(fields, " ", "") == replaced(replaced(value, " ", ""), ",", "") ||
                 value.find('\t') != value.npos);
