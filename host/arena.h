@@ -36,13 +36,14 @@ class la_arena {
 
  private:
   struct release {
-    void operator()(char* block) const { std::free(block); }
+    void operator()(char* memory) const { std::free(memory); }
   };
+  using block = std::unique_ptr<char, release>;
 
   /// Returns the size of the new block.
   std::size_t add_block(std::size_t least);
 
-  std::vector<std::unique_ptr<char, release>> blocks_;
+  std::vector<block> blocks_;
   char* end_ = nullptr;  ///< of the last block; a multiple of any alignment
   std::size_t left_ = 0;
 };

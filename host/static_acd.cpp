@@ -75,7 +75,7 @@ bool StaticAcdRead::read_line(std::string_view line) {
   last_value_ = &passed_over_;
   if (known == la_hash_index::NONE) {
     known = static_cast<int>(entries_.size());
-    last_value_ = &entries_.emplace_back(key).value;
+    last_value_ = &entries_.emplace_back(entry{key, {}}).value;
   }
   *last_value_ = la_trimmed(content.substr(equals + 1));
   return true;
