@@ -1,13 +1,16 @@
 #include "cli/console.h"
 
+#include <limits.h>
 #include <poll.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <utility>
 
+#include "host/port_interrupt.h"
 #include "host/utf8.h"
 
 namespace {
@@ -32,9 +35,49 @@ constexpr appearance appearance_of(Port_MsgLevel level) {
   }
 }
 
-/// What is still to be written to standard error.
+/// What is still to be written, and where. Only one text waits at a time: so all come in order.
 std::string waiting;
+int place = STDERR_FILENO;
 constexpr std::size_t BLOCK = 65536;
+bool lost_results = false;
+
+/// How long to wait for a reader before looking whether this process is to end, in milliseconds.
+/// Nothing when it is to end, and has waited so long already.
+int patience = 1000;
+
+/// Waits until the place takes PIPE_BUF bytes at least.
+bool takes_text() {
+  pollfd event = {place, POLLOUT, 0};
+  return ::poll(&event, 1, patience) > 0;
+}
+
+bool write(std::string_view text) {
+  while (!text.empty()) {
+    const bool is_to_end = Port_Interrupt::Requested() != 0;
+    if (is_to_end && !takes_text()) {
+      patience = 0;
+      return false;
+    }
+    const std::size_t size = is_to_end ? std::min<std::size_t>(text.size(), PIPE_BUF) : text.size();
+    const ssize_t written = ::write(place, text.data(), size);
+    if (written >= 0) {
+      text.remove_prefix(static_cast<std::size_t>(written));
+    } else if (errno == EAGAIN) {
+      // Whoever else writes there may have asked not to wait.
+      takes_text();
+    } else if (errno != EINTR) {
+      return false;
+    }
+  }
+  return true;
+}
+
+void add(int its_place, std::string_view text) {
+  if (place != its_place) console::flush();
+  place = its_place;
+  waiting += text;
+  if (waiting.size() >= BLOCK) console::flush();
+}
 
 }  // namespace
 
@@ -52,24 +95,20 @@ console::~console() {
 }
 
 void console::say(std::string_view text) {
-  waiting += text;
-  if (waiting.size() >= BLOCK) flush();
+  add(STDERR_FILENO, text);
+}
+
+void console::print(std::string_view text) {
+  add(STDOUT_FILENO, text);
 }
 
 void console::flush() {
-  for (std::string_view rest = waiting; !rest.empty();) {
-    const ssize_t written = ::write(STDERR_FILENO, rest.data(), rest.size());
-    if (written >= 0) {
-      rest.remove_prefix(static_cast<std::size_t>(written));
-    } else if (errno == EAGAIN) {
-      // Whoever else writes there may have asked not to wait.
-      pollfd place = {STDERR_FILENO, POLLOUT, 0};
-      ::poll(&place, 1, -1);
-    } else if (errno != EINTR) {
-      break;
-    }
-  }
+  if (!write(waiting) && place == STDOUT_FILENO) lost_results = true;
   waiting.clear();
+}
+
+bool console::has_lost_results() {
+  return lost_results;
 }
 
 void console::show(void* self, const Port_Msg& message) {

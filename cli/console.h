@@ -10,8 +10,8 @@
 #include "host/port_msgman.h"
 
 /// Shows messages on standard error, in colour on a terminal that wants it, until it is destroyed.
-/// A terminal shows each line at once; elsewhere texts wait for flush, for a netlister to start or
-/// to pause, or for the end.
+/// A terminal shows each line at once; elsewhere texts wait for flush, for a text for the other
+/// place, for a netlister to start or to pause, or for the end.
 class console {
  public:
   explicit console(bool debug);
@@ -19,10 +19,14 @@ class console {
   console& operator=(const console&) = delete;
   ~console();
 
-  /// Adds to what waits.
+  /// Adds to what waits for standard error.
   static void say(std::string_view text);
-  /// Writes what waits. To be called before something is written to standard output.
+  /// Adds to what waits for standard output.
+  static void print(std::string_view text);
+  /// Writes what waits. Readers are waited for, unless this process has been asked to end.
   static void flush();
+  /// Whether a text for standard output is lost.
+  static bool has_lost_results();
   /// Whether standard error is a terminal.
   bool is_terminal() const { return is_terminal_; }
 

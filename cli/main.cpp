@@ -12,7 +12,6 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <cstdio>
 #include <cstdlib>
 #include <exception>
 #include <optional>
@@ -81,23 +80,22 @@ std::string complete(settings& set) {
 }
 
 void print_totals(bool ok, int errors, int warnings) {
-  console::flush();
-  std::printf("{\"ok\":%s,\"errors\":%d,\"warnings\":%d}\n", ok ? "true" : "false", errors,
-              warnings);
+  console::print(std::string("{\"ok\":") + (ok ? "true" : "false") + ",\"errors\":" +
+                 std::to_string(errors) + ",\"warnings\":" + std::to_string(warnings) + "}\n");
 }
 
 void print_result(const settings& set, const std::string& name, short result, const char* source,
                   const char* netlist) {
-  console::flush();
   if (set.json) {
-    std::printf("{\"name\":%s,\"result\":%d,\"source\":%s,\"netlist\":%s}\n",
-                json_string(name).c_str(), result, json_string(source).c_str(),
-                json_string(netlist).c_str());
+    console::print("{\"name\":" + json_string(name) + ",\"result\":" + std::to_string(result) +
+                   ",\"source\":" + json_string(source) + ",\"netlist\":" + json_string(netlist) +
+                   "}\n");
   } else if (result == LA_FOUND) {
-    std::printf("%s\n", netlist);
+    console::print(netlist);
+    console::print("\n");
   }
   // Whoever reads the results need not wait for the last of them.
-  std::fflush(stdout);
+  console::flush();
 }
 
 /// Whether the library starts no netlisters, so that what it names need not be there.
@@ -183,7 +181,9 @@ int resolve(settings& set, const console& shown) {
   int status = launcher.ok ? ALL_FOUND : FAILED;
   tally counted;
   const signal_handling while_it_resolves;
-  const auto goes_on = [] { return Port_Interrupt::Requested() == 0 && !std::ferror(stdout); };
+  const auto goes_on = [] {
+    return Port_Interrupt::Requested() == 0 && !console::has_lost_results();
+  };
   for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
     const std::string& name = set.names[i];
     if (shown.is_terminal() && set.names.size() > 1) {
@@ -225,16 +225,14 @@ int explain(settings& set) {
   });
   for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
     // A warning is to stand with the explanation of its name.
-    if (i > 0) std::puts("");
-    std::fflush(stdout);
+    if (i > 0) console::print("\n");
     LA_EXPLANATION why;
     launcher.explain_to(&why);
     char source[LA_MAX_PATH];
     char netlist[LA_MAX_PATH];
     error.clear();
     const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
-    console::flush();
-    std::fputs(explained({set.names[i], result, netlist, error}, why).c_str(), stdout);
+    console::print(explained({set.names[i], result, netlist, error}, why));
     status = worse(status, result);
   }
   return status;
@@ -243,7 +241,6 @@ int explain(settings& set) {
 /// Shows the findings on the rules, and says so when there are no rules at all: the data of the
 /// installation is probably not found.
 void show_findings(const LA_RULE_SET& set) {
-  console::flush();
   if (set.is_valid && set.rules.count == 0) {
     complain("there are no rules; do MYCORVANE and CORVANE name installation roots?");
   }
@@ -264,7 +261,9 @@ int check(const settings& set) {
   for (std::string& hint : hints) hint.insert(0, "hint: ");
   complain(hints);
   if (set.json) print_totals(rules.is_valid, 0, 0);
-  if (!set.json && rules.is_valid) std::printf("Rules checked: %d, all good\n", rules.rules.count);
+  if (!set.json && rules.is_valid) {
+    console::print("Rules checked: " + std::to_string(rules.rules.count) + ", all good\n");
+  }
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
 
@@ -272,7 +271,9 @@ int list_rules(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
   show_findings(rules);
   const diversion to_output([](const Port_Msg& message) {
-    return message.level == PORT_MSG_STATUS && std::fputs(message.text, stdout) >= 0;
+    const bool is_listed = message.level == PORT_MSG_STATUS;
+    if (is_listed) console::print(message.text);
+    return is_listed;
   });
   if (rules.is_valid) rules.dump(set.detail);
   return rules.is_valid ? ALL_FOUND : FAILED;
@@ -281,21 +282,19 @@ int list_rules(const settings& set) {
 int draw_graph(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
   show_findings(rules);
-  if (rules.is_valid) std::fputs(graph_of(rules).c_str(), stdout);
+  if (rules.is_valid) console::print(graph_of(rules));
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
 
 int list_parts() {
-  const std::vector<std::string> parts = PM_PIC::all_parts();
-  console::flush();
-  for (const std::string& part : parts) std::printf("%s\n", part.c_str());
+  for (const std::string& part : PM_PIC::all_parts()) console::print(part + "\n");
   return ALL_FOUND;
 }
 
 int print_completion(const std::string& shell) {
   const std::string script = completion_for(shell);
   if (script.empty()) complain("--completion: there is none for \"" + shell + "\"");
-  std::fputs(script.c_str(), stdout);
+  console::print(script);
   return script.empty() ? FAILED : ALL_FOUND;
 }
 
@@ -306,10 +305,10 @@ int run(settings& set) {
   const console shown(set.debug);
   switch (set.what) {
     case task::HELP:
-      std::fputs(help_text().c_str(), stdout);
+      console::print(help_text());
       return ALL_FOUND;
     case task::VERSION:
-      std::puts("kestrel-launch " KESTREL_VERSION);
+      console::print("kestrel-launch " KESTREL_VERSION "\n");
       return ALL_FOUND;
     case task::RESOLVE:
       return resolve(set, shown);
@@ -340,7 +339,7 @@ int run_command_line(int count, const char* const* words) {
     return FAILED;
   }
   const int status = run(set);
-  if (std::fflush(stdout) != 0 || std::ferror(stdout) != 0) {
+  if (console::has_lost_results()) {
     complain("could not write to standard output");
     return FAILED;
   }

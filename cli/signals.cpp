@@ -16,15 +16,17 @@ void stop(int /*signal*/) {
 struct reaction {
   int signal;
   void (*handler)(int);
+  int flags;
 };
 const std::array REACTIONS = {
-    reaction{SIGINT, Port_Interrupt::Request},
-    reaction{SIGTERM, Port_Interrupt::Request},
-    reaction{SIGHUP, Port_Interrupt::Request},
-    reaction{SIGQUIT, Port_Interrupt::Request},
-    reaction{SIGTSTP, stop},
+    // These end the wait for somebody who does not read.
+    reaction{SIGINT, Port_Interrupt::Request, 0},
+    reaction{SIGTERM, Port_Interrupt::Request, 0},
+    reaction{SIGHUP, Port_Interrupt::Request, 0},
+    reaction{SIGQUIT, Port_Interrupt::Request, 0},
+    reaction{SIGTSTP, stop, SA_RESTART},
     // Who reads the messages may leave. The netlister that runs still ends as it should.
-    reaction{SIGPIPE, SIG_IGN},
+    reaction{SIGPIPE, SIG_IGN, 0},
 };
 
 }  // namespace
@@ -36,10 +38,10 @@ signal_handling::signal_handling() {
   // to reap it.
   ::prctl(PR_SET_CHILD_SUBREAPER, 1);
   for (std::size_t i = 0; i < COUNT; ++i) {
-    const auto& [signal, handler] = REACTIONS[i];
+    const auto& [signal, handler, flags] = REACTIONS[i];
     struct sigaction action = {};
     action.sa_handler = handler;
-    action.sa_flags = SA_RESTART;
+    action.sa_flags = flags;
     ::sigaction(signal, nullptr, &before_[i]);
     if (before_[i].sa_handler != SIG_IGN) ::sigaction(signal, &action, nullptr);
   }

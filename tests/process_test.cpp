@@ -159,30 +159,47 @@ TEST_F(Guest, ACommandShowsMessagesInOrderAndAtOnce) {
   EXPECT_EQ(seen, again + "Launcher: Executing nl say=now out=\"d.kbo\" sleep=60000\nnow\n");
 }
 
-// Whoever shares its standard error has asked not to wait there, and reads late.
-TEST_F(Guest, ACommandLosesNothingWhereItMayNotWait) {
+// Whoever shares its standard error or output may have asked not to wait there, and reads late, or
+// never: then a signal ends it all the same.
+TEST_F(Guest, ACommandLosesNothingToLateReadersAndDoesNotWaitForever) {
+  ::signal(SIGTERM, SIG_DFL);
   std::string names;
   for (int i = 0; i < 5000; ++i) names += "nowhere\n";
   tree.write("names", names);
-  int ends[2];
-  ASSERT_EQ(::pipe(ends), 0);
-  ASSERT_LT(ends[1], 10);  // The shell takes one digit.
-  ::fcntl(ends[1], F_SETFL, O_NONBLOCK);
-  std::string said;
-  const std::string command = KESTREL_LAUNCH, to = " --names-from names 2>&";
-  run({"/bin/sh", "-c", "exec " + command + to + std::to_string(ends[1])}, [&](pid_t) {
-    ::close(ends[1]);
-    int waiting = 0;
-    for (int i = 0; i < 20'000 && waiting < 60'000; ++i, ::usleep(1000)) {
-      ::ioctl(ends[0], FIONREAD, &waiting);
-    }
-    char block[4096];
-    for (ssize_t length; (length = ::read(ends[0], block, sizeof block)) > 0;) {
-      said.append(block, static_cast<std::size_t>(length));
-    }
-  });
-  ::close(ends[0]);
-  EXPECT_EQ(std::count(said.begin(), said.end(), '\n'), 5001);
+  for (const auto& row : table(R"(
+2>              | nonblock | read | 1
+--json 2>log 1> | nonblock | read | 1
+2>              | block    | kill | 143
+--json 2>log 1> | block    | kill | 143
+--json 2>log 1> | nonblock | kill | 143
+)")) {
+    int ends[2];
+    ASSERT_EQ(::pipe(ends), 0);
+    ASSERT_LT(ends[1], 10);  // The shell takes one digit.
+    if (row[1] == "nonblock") ::fcntl(ends[1], F_SETFL, O_NONBLOCK);
+    std::string said;
+    const auto reader = [&](pid_t launch) {
+      ::close(ends[1]);
+      int waiting = 0;
+      for (int i = 0; i < 20'000 && waiting < 60'000; ++i, ::usleep(1000)) {
+        ::ioctl(ends[0], FIONREAD, &waiting);
+      }
+      if (row[2] == "kill") {
+        ::kill(launch, SIGTERM);
+        return;
+      }
+      char block[4096];
+      for (ssize_t length; (length = ::read(ends[0], block, sizeof block)) > 0;) {
+        said.append(block, static_cast<std::size_t>(length));
+      }
+    };
+    const std::string command = KESTREL_LAUNCH, place = row[0] + "&" + std::to_string(ends[1]);
+    const Ran ran =
+        run({"/bin/sh", "-c", "exec " + command + " --names-from names " + place}, reader);
+    ::close(ends[0]);
+    EXPECT_EQ(ran.status, std::stoi(row[3])) << row[0];
+    EXPECT_EQ(std::count(said.begin(), said.end(), '\n'), row[2] == "read" ? 5001 : 0) << row[0];
+  }
 }
 
 // The signals come when the last netlister of a chain has begun to write its output.
