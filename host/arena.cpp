@@ -8,7 +8,7 @@
 namespace {
 
 constexpr std::size_t BIG_PAGE = 2UL << 20;
-constexpr std::size_t FIRST_BLOCK = 32UL << 10;
+constexpr std::size_t FIRST_BLOCK = 1UL << 10;
 constexpr std::size_t BIGGEST_BLOCK = 16UL << 20;
 
 }  // namespace
@@ -19,8 +19,10 @@ char* la_new_block(std::size_t size) {
   size = (size + unit - 1) / unit * unit;
   void* block = std::aligned_alloc(unit, size);
   if (block == nullptr) throw std::bad_alloc();
+#ifdef MADV_HUGEPAGE
   // A system without big pages refuses: that costs time, nothing else.
   if (big) ::madvise(block, size, MADV_HUGEPAGE);
+#endif
   return static_cast<char*>(block);
 }
 

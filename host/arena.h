@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdlib>
 #include <memory>
+#include <new>
 #include <string>
 #include <utility>
 #include <vector>
@@ -13,8 +14,8 @@
 /// caller's to release with std::free.
 char* la_new_block(std::size_t size);
 
-/// Hands out memory piece by piece, and releases all of it at its end. It takes few blocks, each
-/// bigger than the one before.
+/// Hands out memory piece by piece, and releases all of it at its end. It takes few blocks, which
+/// grow with what is taken.
 class la_arena {
  public:
   la_arena() = default;
@@ -24,9 +25,10 @@ class la_arena {
   /// A new object, made from the arguments. It is the caller's to destroy, and not to release.
   template <class Type, class... Arguments>
   Type* make(Arguments&&... arguments) {
+    static_assert(alignof(Type) <= alignof(std::max_align_t), "blocks are aligned no better");
     return new (take(sizeof(Type), alignof(Type))) Type(std::forward<Arguments>(arguments)...);
   }
-  /// Room for size bytes, with the alignment of some type.
+  /// Room for size bytes. The alignment is a power of two, at most that of std::max_align_t.
   void* take(std::size_t size, std::size_t alignment) {
     std::size_t left = left_ / alignment * alignment;
     if (size > left) left = add_block(size);
@@ -44,11 +46,11 @@ class la_arena {
   std::size_t add_block(std::size_t least);
 
   std::vector<block> blocks_;
-  char* end_ = nullptr;  ///< of the last block; a multiple of any alignment
+  char* end_ = nullptr;  ///< of the last block; a multiple of any such alignment
   std::size_t left_ = 0;
 };
 
-/// Gives containers such blocks.
+/// Gives strings such blocks.
 template <class Type>
 struct la_block_allocator {
   using value_type = Type;

@@ -41,7 +41,7 @@ class la_hash_index {
   la_hash_index() = default;
   /// With room for so many numbers.
   explicit la_hash_index(int count)
-      : slots_(std::bit_ceil(2 * static_cast<std::size_t>(count) + 1)) {}
+      : slots_(std::bit_ceil(2 * static_cast<std::size_t>(count) + 2)) {}
 
   /// The number under this hash for which is_it(number) holds, or NONE.
   template <class Test>

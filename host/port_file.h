@@ -6,6 +6,7 @@
 #include <memory>
 #include <string>
 
+#include "host/arena.h"
 #include "host/ut_str.h"
 
 #if !defined(_MSC_VER)

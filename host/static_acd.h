@@ -7,6 +7,7 @@
 #include <string>
 #include <string_view>
 
+#include "host/arena.h"
 #include "host/blanks.h"
 #include "host/hash_index.h"
 #include "host/port_string.h"
@@ -46,7 +47,7 @@ class StaticAcdRead {
     text = end == text.npos ? std::string_view() : text.substr(end + 1);
     return piece;
   }
-  /// All keys and their values, in the order of the file.
+  /// All keys and their values, in the order of the file; good as long as this object.
   const std::deque<entry>& entries() const { return entries_; }
   /// False when something of the file could not be read or understood.
   bool valid() const { return valid_; }
@@ -60,8 +61,8 @@ class StaticAcdRead {
   std::string_view joined(std::string_view value, std::string_view content);
 
   la_long_string text_;  ///< the file, with the lines of a value joined where the first stands
-  std::deque<entry> entries_;
-  la_hash_index index_;  ///< of the entries, by key
+  std::deque<entry> entries_;  ///< stay where they are: last_value_ points into them
+  la_hash_index index_;        ///< of the entries, by key
   mutable std::size_t last_found_ = 0;
   std::string_view* last_value_ = nullptr;
   std::string_view passed_over_;  ///< the value of a key that stands earlier too

@@ -4,6 +4,7 @@
 #include <cstring>
 #include <string_view>
 
+#include "host/arena.h"
 #include "host/blanks.h"
 
 namespace {
@@ -124,7 +125,7 @@ int UT_STR::IsAlpha(int c) {
   return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
 }
 
-la_text::la_text(const char* chars, std::size_t length, la_arena* memory) {
+la_text::la_text(const char* chars, std::size_t length, la_arena* arena) {
   if (chars == nullptr) {
     room_[LAST] = ABSENT;
     return;
@@ -133,9 +134,9 @@ la_text::la_text(const char* chars, std::size_t length, la_arena* memory) {
   if (length < SIZE) {
     room_[LAST] = IN_PLACE;
   } else {
-    to = memory != nullptr ? static_cast<char*>(memory->take(length + 1, 1)) : new char[length + 1];
+    to = arena != nullptr ? static_cast<char*>(arena->take(length + 1, 1)) : new char[length + 1];
     std::memcpy(room_, &to, sizeof to);
-    room_[LAST] = memory != nullptr ? IN_ARENA : ELSEWHERE;
+    room_[LAST] = arena != nullptr ? IN_ARENA : ELSEWHERE;
   }
   std::memcpy(to, chars, length);
   to[length] = '\0';

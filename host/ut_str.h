@@ -6,7 +6,7 @@
 #include <cstddef>
 #include <cstring>
 
-#include "host/arena.h"
+class la_arena;
 
 /// Length, terminator included, of every fixed path buffer.
 constexpr int LA_MAX_PATH = 260;
@@ -58,7 +58,8 @@ class UT_STR {
   static int IsAlpha(int c);
 };
 
-/// An owned string, or none. Copies are deep. Short strings are kept in place: a move moves them.
+/// A string of its own, or none. Copies are deep. Short strings are kept in place: a move moves
+/// them.
 class la_text {
  public:
   la_text() noexcept { room_[LAST] = ABSENT; }
@@ -66,10 +67,10 @@ class la_text {
   la_text(const char* chars) : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0) {}
   /// A copy of so many of chars; null makes an absent text.
   la_text(const char* chars, std::size_t length) : la_text(chars, length, nullptr) {}
-  /// A copy of chars that lies in memory when it is long, and must not outlive it then; nor must
-  /// what it is moved to. Null makes an absent text.
-  la_text(const char* chars, la_arena& memory)
-      : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0, &memory) {}
+  /// A copy of chars that the arena holds when it is long. Neither this text nor one that it is
+  /// moved to may be read after the end of the arena; a copy may. Null makes an absent text.
+  la_text(const char* chars, la_arena& arena)
+      : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0, &arena) {}
   la_text(const la_text& other) : la_text(other.get()) {}
   la_text(la_text&& other) noexcept { take(other); }
   la_text& operator=(const la_text& other) { return *this = la_text(other); }
@@ -95,7 +96,7 @@ class la_text {
   static constexpr std::size_t SIZE = 16;
   static constexpr std::size_t LAST = SIZE - 1;
 
-  la_text(const char* chars, std::size_t length, la_arena* memory);
+  la_text(const char* chars, std::size_t length, la_arena* arena);
 
   char* elsewhere() const noexcept {
     char* chars;

@@ -4,6 +4,7 @@
 #include <exception>
 #include <string>
 #include <string_view>
+#include <type_traits>
 #include <vector>
 
 #include "host/blanks.h"
@@ -158,15 +159,12 @@ const char* name_of(const std::optional<LA_FILE>& file) {
 
 }  // namespace
 
-LA_RULE::LA_RULE(const char* rule_name) : LA_RULE(rule_name, std::make_unique<la_arena>()) {}
-
-LA_RULE::LA_RULE(const char* rule_name, std::unique_ptr<la_arena> own_memory)
-    : LA_RULE(rule_name, *own_memory) {
-  own_memory_ = std::move(own_memory);
-}
-
-LA_RULE::LA_RULE(const char* rule_name, la_arena& memory)
-    : rule_name(rule_name, memory), netlister_status(3), checker_status(3), memory_(memory) {}
+LA_RULE::LA_RULE(const char* rule_name, la_arena* arena)
+    : own_arena_(arena == nullptr ? new la_arena : nullptr),
+      arena_(arena == nullptr ? *own_arena_ : *arena),
+      rule_name(rule_name, arena_),
+      netlister_status(3),
+      checker_status(3) {}
 
 LA_RULE::~LA_RULE() {
   if (dependency_files) {
@@ -220,12 +218,15 @@ void LA_RULE::set_checker_dir(const char* text) {
   set_dir(checker_dir_flag, checker_dir, text);
 }
 
+// Nobody destroys the entries.
+static_assert(std::is_trivially_destructible_v<LA_STATUS>);
+
 void LA_RULE::add_netlister_status(const LA_STATUS& entry) {
-  netlister_status.append(memory_.make<LA_STATUS>(entry));
+  netlister_status.append(arena_.make<LA_STATUS>(entry));
 }
 
 void LA_RULE::add_checker_status(const LA_STATUS& entry) {
-  checker_status.append(memory_.make<LA_STATUS>(entry));
+  checker_status.append(arena_.make<LA_STATUS>(entry));
 }
 
 bool LA_RULE::add_netlister_status(unsigned short level, const char* text) {
@@ -383,6 +384,7 @@ bool validate_rules(const DARRAY_LA_RULE_PTR& batch) {
 
 namespace {
 
+/// The memory of the rule is that of its arena.
 struct destroy_rule {
   void operator()(LA_RULE* rule) const { std::destroy_at(rule); }
 };
@@ -394,7 +396,7 @@ struct rule_batch {
   rule_batch(const rule_batch&) = delete;
   rule_batch& operator=(const rule_batch&) = delete;
   ~rule_batch() {
-    for (LA_RULE* rule : rules) std::destroy_at(rule);
+    for (LA_RULE* rule : rules) destroy_rule()(rule);
   }
 
   void add(owned_rule rule) {
@@ -505,8 +507,8 @@ static_assert(LA_MAX_PATH == 260 && la_statement_reader::MAX_LINES == 32767);
 
 class user_rules_loader {
  public:
-  user_rules_loader(const char* file_name, Port::Stream& stream, la_arena& memory)
-      : file_name_(file_name), reader_(stream), memory_(memory) {}
+  user_rules_loader(const char* file_name, Port::Stream& stream, la_arena& arena)
+      : file_name_(file_name), reader_(stream), arena_(arena) {}
 
   /// Reads the whole file into rules. Returns whether there was no error.
   bool read() {
@@ -538,7 +540,7 @@ class user_rules_loader {
   void take_statement(std::string_view keyword, const char* value) {
     if (is_same(keyword, "RuleName")) {
       finish_rule();
-      rule_.reset(memory_.make<LA_RULE>(value, memory_));
+      rule_.reset(arena_.make<LA_RULE>(value, &arena_));
       return;
     }
     if (!rule_) return report("%s", "Rule does not have a RuleName");
@@ -565,7 +567,7 @@ class user_rules_loader {
   const char* file_name_;
   la_statement_reader reader_;
   bool good_ = true;
-  la_arena& memory_;
+  la_arena& arena_;
   owned_rule rule_;
   rule_batch named_;
   rule_batch extension_;
@@ -604,7 +606,7 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
     message().issueError("Launcher: Could not open user rules file \"%s\".\n", file_name);
     return false;
   }
-  user_rules_loader loader(file_name, *stream, memory_);
+  user_rules_loader loader(file_name, *stream, arena_);
   const bool good = loader.read() && loader.validate();
   loader.move_to(rules);
   add_file(file.get_fullfile());
@@ -632,8 +634,8 @@ std::string system_rules_file(PM_PIC& device) {
 
 class system_rules_loader {
  public:
-  system_rules_loader(const char* path, la_arena& memory)
-      : reader_(path, nullptr, nullptr, 1, 0, 1), memory_(memory) {}
+  system_rules_loader(const char* path, la_arena& arena)
+      : reader_(path, nullptr, nullptr, 1, 0, 1), arena_(arena) {}
 
   /// Reads all rules. Returns whether there was no error.
   bool read() {
@@ -656,7 +658,7 @@ class system_rules_loader {
 
  private:
   void read_rule(const char* name) {
-    owned_rule rule(memory_.make<LA_RULE>(name, memory_));
+    owned_rule rule(arena_.make<LA_RULE>(name, &arena_));
     if (UT_STR::Len(name) >= LA_MAX_PATH) refuse_length(name, "The name");
     record_.assign(reader_.value(name));
     std::string_view record = record_;
@@ -733,7 +735,7 @@ class system_rules_loader {
   }
 
   StaticAcdRead reader_;
-  la_arena& memory_;
+  la_arena& arena_;
   std::string record_;  ///< of the current rule, to be cut into its fields
   bool good_ = true;
   rule_batch batch_;
@@ -754,7 +756,7 @@ bool LA_RULE_SET::load_system_rules(const char* part_name) {
   }
   const std::string path = system_rules_file(*device);
   device.reset();
-  system_rules_loader loader(path.c_str(), memory_);
+  system_rules_loader loader(path.c_str(), arena_);
   if (!loader.read() || !loader.validate()) return false;
   loader.move_to(rules);
   add_file(path);
@@ -779,7 +781,7 @@ LA_RULE_SET::LA_RULE_SET(const char* part_name, const char* user_rules_file) : r
 }
 
 LA_RULE_SET::~LA_RULE_SET() {
-  for (LA_RULE* rule : rules) std::destroy_at(rule);
+  for (LA_RULE* rule : rules) destroy_rule()(rule);
 }
 
 bool LA_RULE_SET::load(const char* part_name, const char* user_rules_file) {

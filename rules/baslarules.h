@@ -58,13 +58,13 @@ bool parse_status(const char* text, unsigned short& op, int& code);
 using DARRAY_LA_STATUS_PTR = UT_TYPED_DARRAY<LA_STATUS*>;
 using DARRAY_LA_FILE_PTR = UT_TYPED_DARRAY<LA_FILE*>;
 
-/// One rule. It owns all that its fields hold. A text that is absent is null.
+/// One rule. All that its fields hold is its own, and ends with it. A text that is absent is null.
 class LA_RULE {
  public:
-  /// A rule with a copy of this name and nothing else.
-  explicit LA_RULE(const char* rule_name);
-  /// Likewise. Texts and exit-status entries lie in memory, which must outlive the rule.
-  LA_RULE(const char* rule_name, la_arena& memory);
+  /// A rule with a copy of this name and nothing else. The arena, which must outlive it, holds
+  /// the texts and exit-status entries that it is given, and also keeps those that are replaced;
+  /// for null, the rule has an arena of its own.
+  explicit LA_RULE(const char* rule_name, la_arena* arena = nullptr);
   LA_RULE(const LA_RULE&) = delete;
   LA_RULE& operator=(const LA_RULE&) = delete;
   ~LA_RULE();
@@ -82,16 +82,16 @@ class LA_RULE {
   bool has_dependency_files() const { return dependency_files && dependency_files->count > 0; }
 
   /// Replace the text by a copy; null removes it. They return the new text, which the rule owns.
-  const char* set_netlister(const char* text) { return netlister = la_text(text, memory_); }
+  const char* set_netlister(const char* text) { return netlister = la_text(text, arena_); }
   const char* set_netlister_top_options(const char* text) {
-    return netlister_top_options = la_text(text, memory_);
+    return netlister_top_options = la_text(text, arena_);
   }
   const char* set_netlister_options(const char* text) {
-    return netlister_options = la_text(text, memory_);
+    return netlister_options = la_text(text, arena_);
   }
-  const char* set_checker(const char* text) { return checker = la_text(text, memory_); }
+  const char* set_checker(const char* text) { return checker = la_text(text, arena_); }
   const char* set_checker_options(const char* text) {
-    return checker_options = la_text(text, memory_);
+    return checker_options = la_text(text, arena_);
   }
 
   /// Store a copy of dir, or none for null, and the flag as it is.
@@ -116,6 +116,11 @@ class LA_RULE {
   /// Issues the rule as status messages: in one line, or field by field, without dependency files.
   void dump(bool detail) const;
 
+ private:
+  std::unique_ptr<la_arena> own_arena_;
+  la_arena& arena_;
+
+ public:
   la_text rule_name;
   std::optional<LA_FILE> netlist_file;  ///< the sources that the rule applies to
   std::optional<LA_FILE> target;        ///< only its extension counts
@@ -131,12 +136,6 @@ class LA_RULE {
   std::unique_ptr<LA_DIR> checker_dir;
   DARRAY_LA_STATUS_PTR netlister_status;
   DARRAY_LA_STATUS_PTR checker_status;
-
- private:
-  LA_RULE(const char* rule_name, std::unique_ptr<la_arena> own_memory);
-
-  std::unique_ptr<la_arena> own_memory_;
-  la_arena& memory_;
 };
 
 using DARRAY_LA_RULE_PTR = UT_TYPED_DARRAY<LA_RULE*>;
@@ -155,7 +154,7 @@ struct LA_RULES_FILE {
 };
 
 /// The rules of a launcher, in the order of precedence: those of the user rules file (rules for
-/// named files first), those of the device's family, the default ones. It owns them.
+/// named files first), those of the device's family, the default ones. They end with it.
 class LA_RULE_SET {
  public:
   /// Loads, completes and checks the rules. part_name and user_rules_file may be null. Findings
@@ -181,7 +180,7 @@ class LA_RULE_SET {
   bool load_system_rules(const char* part_name);
   bool check_rules();
 
-  la_arena memory_;  ///< of the rules
+  la_arena arena_;  ///< of the rules
 };
 
 #endif

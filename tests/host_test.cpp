@@ -39,7 +39,7 @@ TEST_F(Host, PiecesOfAnArenaAreAlignedAndApart) {
   la_arena memory;
   std::vector<std::pair<char*, std::size_t>> pieces;
   for (std::size_t i = 0; i < 9'000; ++i) {
-    const std::size_t size = 1 + (i % 3'000 == 2'999 ? i * 300 : i % 1'000);
+    const std::size_t size = 1 + (i % 3'000 == 0 ? 100'000 + i * 300 : i % 1'000);
     const std::size_t alignment = std::size_t{1} << i % 5;
     pieces.emplace_back(static_cast<char*>(memory.take(size, alignment)), size);
     EXPECT_EQ(reinterpret_cast<std::uintptr_t>(pieces.back().first) % alignment, 0U) << i;

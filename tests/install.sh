@@ -13,6 +13,7 @@ cd "$dir"
 cmake --install "$build" --prefix "$dir/first" >/dev/null
 mv first moved
 sed -n '/^```cpp$/,/^```$/{/^```/!p}' "$source/docs/embedding.md" | sed '/^}/q' >host.cpp
+echo 'LA_DIR copy_of(const LA_DIR& dir) { return dir; }' >>host.cpp
 cat >CMakeLists.txt <<END
 cmake_minimum_required(VERSION 3.22)
 project(host LANGUAGES CXX)

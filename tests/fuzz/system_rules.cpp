@@ -12,12 +12,12 @@ void examine(const std::string& input, Tree& tree) {
   tree.write(path, input);
   const StaticAcdRead reader(path, nullptr, nullptr, 1, 0, 1);
   for (const StaticAcdRead::entry& each : reader.entries()) {
-    const std::string value = reader.GetStringByKey(each.key.data(), "\n", 0, nullptr, 0).c_str();
+    const std::string key(each.key);
+    const std::string value = reader.GetStringByKey(key.c_str(), "\n", 0, nullptr, 0).c_str();
     // The fields are all of the value but blanks and commas.
     std::string fields;
     for (std::size_t i = 0; i <= value.size(); ++i) {
-      fields +=
-          reader.GetStringByKey(each.key.data(), ",", static_cast<short>(i), nullptr, 0).c_str();
+      fields += reader.GetStringByKey(key.c_str(), ",", static_cast<short>(i), nullptr, 0).c_str();
     }
     EXPECT_TRUE(replaced(fields, " ", "") == replaced(replaced(value, " ", ""), ",", "") ||
                 value.find('\t') != value.npos);
