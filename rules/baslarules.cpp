@@ -39,7 +39,8 @@ bool is_none(const char* text) {
 }
 
 bool is_same(std::string_view a, std::string_view b) {
-  return a.size() == b.size() && UT_STR::INCompare(a.data(), b.data(), a.size()) == 0;
+  // As a rule they are spelt alike.
+  return a.size() == b.size() && (a == b || UT_STR::INCompare(a.data(), b.data(), a.size()) == 0);
 }
 
 }  // namespace

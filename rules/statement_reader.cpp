@@ -4,6 +4,8 @@
 #include <cstring>
 #include <string_view>
 
+#include "host/blanks.h"
+
 namespace {
 
 /// The characters that end a token: the end of the line, blanks and delimiters.
@@ -20,18 +22,21 @@ constexpr token_ends KEYWORD_ENDS = with_delimiters("=;");
 constexpr token_ends VALUE_ENDS = with_delimiters("\";");
 constexpr token_ends STATEMENT_ENDS = with_delimiters(";");
 
-/// Copies the token at the front of line, behind blanks, and moves line on behind what ends it.
-/// Returns that character, a blank as a space; 0 when it is the end of the line.
-char take_token(char*& line, char* token, const token_ends& ends) {
-  while (*line == ' ' || *line == '\t') ++line;
-  const char* start = line;
-  while (!ends[static_cast<unsigned char>(*line)]) ++line;
-  const auto length = static_cast<std::size_t>(line - start);
-  std::memcpy(token, start, length);
-  token[length] = '\0';
-  const char end = *line;
-  if (end != '\0') ++line;
-  return end == '\t' ? ' ' : end;
+struct token {
+  std::string_view text;
+  char end;  ///< the character that ends it, a blank as a space; 0 for the end of the line
+
+  /// Copies the text into a buffer that has room for it.
+  void copy_to(char* buffer) const { buffer[text.copy(buffer, text.size())] = '\0'; }
+};
+
+/// Takes the token at the front of line, and what ends it.
+token take_token(char*& line, const token_ends& ends) {
+  char* at = line;
+  while (!ends[static_cast<unsigned char>(*at)]) ++at;
+  const std::string_view text(line, at);
+  line = *at != '\0' ? at + 1 : at;
+  return {text, *at == '\t' ? ' ' : *at};
 }
 
 }  // namespace
@@ -39,7 +44,11 @@ char take_token(char*& line, char* token, const token_ends& ends) {
 la_statement_reader::item_kind la_statement_reader::next() {
   while (!ended_) {
     item_kind item = NOTHING;
-    if (!UT_STR::AllBlank(rest_)) {
+    char* start = rest_;
+    while (la_is_blank(*start)) ++start;
+    if (*start != '\0') {
+      // Only in quotes the blanks count.
+      if (state_ != QUOTED) rest_ = start;
       item = step();
     } else if (stream_.geteof()) {
       item = end_of_file();
@@ -85,31 +94,34 @@ la_statement_reader::item_kind la_statement_reader::go(state next_state, item_ki
 la_statement_reader::item_kind la_statement_reader::step() {
   switch (state_) {
     case KEYWORD: {
-      const char end = take_token(rest_, keyword_, KEYWORD_ENDS);
-      if (end == ' ') return go(EQUALS);
-      return end == '=' ? go(VALUE) : go(SKIP, EXPECTING_KEYWORD);
+      const token keyword = take_token(rest_, KEYWORD_ENDS);
+      keyword.copy_to(keyword_);
+      if (keyword.end == ' ') return go(EQUALS);
+      return keyword.end == '=' ? go(VALUE) : go(SKIP, EXPECTING_KEYWORD);
     }
     case EQUALS: {
-      const char end = take_token(rest_, token_, KEYWORD_ENDS);
-      return end == '=' && *token_ == '\0' ? go(VALUE) : go(SKIP, EXPECTING_EQUALS);
+      const auto [text, end] = take_token(rest_, KEYWORD_ENDS);
+      return end == '=' && text.empty() ? go(VALUE) : go(SKIP, EXPECTING_EQUALS);
     }
     case VALUE:
       return step_value();
     case QUOTED:
       return step_quoted();
     case SEMICOLON: {
-      const char end = take_token(rest_, token_, STATEMENT_ENDS);
-      return end == ';' && *token_ == '\0' ? go(KEYWORD, STATEMENT) : go(SKIP, EXPECTING_SEMICOLON);
+      const auto [text, end] = take_token(rest_, STATEMENT_ENDS);
+      return end == ';' && text.empty() ? go(KEYWORD, STATEMENT) : go(SKIP, EXPECTING_SEMICOLON);
     }
     case SKIP:
-      return take_token(rest_, token_, STATEMENT_ENDS) == ';' ? go(KEYWORD) : NOTHING;
+      return take_token(rest_, STATEMENT_ENDS).end == ';' ? go(KEYWORD) : NOTHING;
   }
   return NOTHING;
 }
 
 la_statement_reader::item_kind la_statement_reader::step_value() {
   value_refused_ = false;
-  switch (take_token(rest_, value_, VALUE_ENDS)) {
+  const token value = take_token(rest_, VALUE_ENDS);
+  value.copy_to(value_);
+  switch (value.end) {
     case ' ':
       return go(SEMICOLON);
     case '"':

@@ -59,7 +59,6 @@ class la_statement_reader {
   bool ended_ = false;
   char line_[LA_MAX_PATH] = "";
   char* rest_ = line_;  ///< what has not been taken of the line
-  char token_[LA_MAX_PATH] = "";
   char keyword_[LA_MAX_PATH] = "";
   char value_[LA_MAX_PATH] = "";
 };
