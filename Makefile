@@ -58,7 +58,7 @@ test:
 	@cd $(BUILD) && ctest --output-on-failure --parallel $(JOBS)
 	@echo "All tests passed, of $(BUILD)/bin/kestrel-launch and its library."
 
-# Some eight minutes, on a machine with nothing else to do.
+# Two to eight minutes, on a machine with nothing else to do.
 bench:
 	@tools/setup $(BENCH_PACKAGES)
 	@cmake -S . -B $(BUILD) -DCMAKE_BUILD_TYPE=Release -DKESTREL_TESTS=OFF -DKESTREL_BENCH=ON >/dev/null
