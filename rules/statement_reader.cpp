@@ -91,7 +91,7 @@ la_statement_reader::item_kind la_statement_reader::go(state next_state, item_ki
 }
 
 /// One step on the rest of the line, which is not blank.
-la_statement_reader::item_kind la_statement_reader::step() {
+inline la_statement_reader::item_kind la_statement_reader::step() {
   switch (state_) {
     case KEYWORD: {
       const token keyword = take_token(rest_, KEYWORD_ENDS);
