@@ -1,16 +1,15 @@
 #include "cli/console.h"
 
-#include <limits.h>
 #include <poll.h>
 #include <unistd.h>
 
-#include <algorithm>
+#include <array>
+#include <atomic>
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <utility>
 
-#include "host/port_interrupt.h"
 #include "host/utf8.h"
 
 namespace {
@@ -37,44 +36,36 @@ constexpr appearance appearance_of(Port_MsgLevel level) {
 
 /// What is still to be written, and where. Only one text waits at a time: so all come in order.
 std::string waiting;
-int place = STDERR_FILENO;
+int descriptor = STDERR_FILENO;
 constexpr std::size_t BLOCK = 65536;
-bool lost_results = false;
 
-/// How long to wait for a reader before looking whether this process is to end, in milliseconds.
-/// Nothing when it is to end, and has waited so long already.
-int patience = 1000;
+/// Whether texts for a descriptor are dropped.
+std::array<bool, STDERR_FILENO + 1> is_lost = {};
 
-/// Waits until the place takes PIPE_BUF bytes at least.
-bool takes_text() {
-  pollfd event = {place, POLLOUT, 0};
-  return ::poll(&event, 1, patience) > 0;
-}
+std::atomic<int> hurries = 0;
+static_assert(std::atomic<int>::is_always_lock_free);
 
-bool write(std::string_view text) {
-  while (!text.empty()) {
-    const bool is_to_end = Port_Interrupt::Requested() != 0;
-    if (is_to_end && !takes_text()) {
-      patience = 0;
-      return false;
-    }
-    const std::size_t size = is_to_end ? std::min<std::size_t>(text.size(), PIPE_BUF) : text.size();
-    const ssize_t written = ::write(place, text.data(), size);
+/// Returns whether all of the text is written.
+bool write_all(std::string_view text) {
+  const int hurries_before = hurries;
+  while (!text.empty() && hurries - hurries_before < 2) {
+    const ssize_t written = ::write(descriptor, text.data(), text.size());
     if (written >= 0) {
       text.remove_prefix(static_cast<std::size_t>(written));
     } else if (errno == EAGAIN) {
       // Whoever else writes there may have asked not to wait.
-      takes_text();
+      pollfd event = {descriptor, POLLOUT, 0};
+      ::poll(&event, 1, -1);
     } else if (errno != EINTR) {
       return false;
     }
   }
-  return true;
+  return text.empty();
 }
 
-void add(int its_place, std::string_view text) {
-  if (place != its_place) console::flush();
-  place = its_place;
+void add(int its_descriptor, std::string_view text) {
+  if (descriptor != its_descriptor) console::flush();
+  descriptor = its_descriptor;
   waiting += text;
   if (waiting.size() >= BLOCK) console::flush();
 }
@@ -103,12 +94,19 @@ void console::print(std::string_view text) {
 }
 
 void console::flush() {
-  if (!write(waiting) && place == STDOUT_FILENO) lost_results = true;
+  if (!is_lost[descriptor] && !write_all(waiting)) {
+    // There may be room for later messages. Results are complete up to a point.
+    is_lost[descriptor] = descriptor == STDOUT_FILENO || hurries != 0;
+  }
   waiting.clear();
 }
 
+void console::hurry() {
+  ++hurries;
+}
+
 bool console::has_lost_results() {
-  return lost_results;
+  return is_lost[STDOUT_FILENO];
 }
 
 void console::show(void* self, const Port_Msg& message) {

@@ -10,8 +10,8 @@
 #include "host/port_msgman.h"
 
 /// Shows messages on standard error, in colour on a terminal that wants it, until it is destroyed.
-/// A terminal shows each line at once; elsewhere texts wait for flush, for a text for the other
-/// place, for a netlister to start or to pause, or for the end.
+/// A terminal shows each message at once; all other texts wait for flush, for a text for the other
+/// descriptor, for a netlister to start or to pause, or for the end.
 class console {
  public:
   explicit console(bool debug);
@@ -23,8 +23,10 @@ class console {
   static void say(std::string_view text);
   /// Adds to what waits for standard output.
   static void print(std::string_view text);
-  /// Writes what waits. Readers are waited for, unless this process has been asked to end.
+  /// Writes what waits, and waits for its readers until hurry was called twice meanwhile.
   static void flush();
+  /// For a signal handler without SA_RESTART, once a second when this process is to end.
+  static void hurry();
   /// Whether a text for standard output is lost.
   static bool has_lost_results();
   /// Whether standard error is a terminal.

@@ -1,7 +1,7 @@
 // kestrel-launch: the launcher as a command.
 //
 //   settings   reads the command line; holds the table of options
-//   console    shows messages and makes JSON
+//   console    shows messages, prints results and makes JSON
 //   completion completes command lines in a shell
 //   explain    tells why
 //   graph      draws the rules
@@ -211,6 +211,8 @@ int resolve(settings& set, const console& shown) {
   }
   counted.tell(set.names.size());
   if (set.json) print_totals(launcher.ok, launcher.errors, launcher.warnings);
+  // While signals are still handled: whoever reads may have left.
+  console::flush();
   return status;
 }
 
@@ -224,7 +226,6 @@ int explain(settings& set) {
     return message.level != PORT_MSG_WARNING;
   });
   for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
-    // A warning is to stand with the explanation of its name.
     if (i > 0) console::print("\n");
     LA_EXPLANATION why;
     launcher.explain_to(&why);
@@ -233,6 +234,7 @@ int explain(settings& set) {
     error.clear();
     const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
     console::print(explained({set.names[i], result, netlist, error}, why));
+    console::flush();
     status = worse(status, result);
   }
   return status;

@@ -1,7 +1,9 @@
 #include "cli/signals.h"
 
 #include <sys/prctl.h>
+#include <unistd.h>
 
+#include "cli/console.h"
 #include "host/port_interrupt.h"
 
 namespace {
@@ -13,20 +15,32 @@ void stop(int /*signal*/) {
   Port_Interrupt::PassOn(SIGCONT);
 }
 
+/// Interrupts what waits for somebody who does not read, also what was about to begin to.
+void tick(int /*signal*/) {
+  console::hurry();
+  ::alarm(1);
+}
+
+void request(int signal) {
+  Port_Interrupt::Request(signal);
+  struct sigaction action = {};
+  action.sa_handler = tick;
+  ::sigaction(SIGALRM, &action, nullptr);
+  ::alarm(1);
+}
+
 struct reaction {
   int signal;
   void (*handler)(int);
-  int flags;
 };
 const std::array REACTIONS = {
-    // These end the wait for somebody who does not read.
-    reaction{SIGINT, Port_Interrupt::Request, 0},
-    reaction{SIGTERM, Port_Interrupt::Request, 0},
-    reaction{SIGHUP, Port_Interrupt::Request, 0},
-    reaction{SIGQUIT, Port_Interrupt::Request, 0},
-    reaction{SIGTSTP, stop, SA_RESTART},
+    reaction{SIGINT, request},
+    reaction{SIGTERM, request},
+    reaction{SIGHUP, request},
+    reaction{SIGQUIT, request},
+    reaction{SIGTSTP, stop},
     // Who reads the messages may leave. The netlister that runs still ends as it should.
-    reaction{SIGPIPE, SIG_IGN, 0},
+    reaction{SIGPIPE, SIG_IGN},
 };
 
 }  // namespace
@@ -38,16 +52,17 @@ signal_handling::signal_handling() {
   // to reap it.
   ::prctl(PR_SET_CHILD_SUBREAPER, 1);
   for (std::size_t i = 0; i < COUNT; ++i) {
-    const auto& [signal, handler, flags] = REACTIONS[i];
+    const auto& [signal, handler] = REACTIONS[i];
     struct sigaction action = {};
     action.sa_handler = handler;
-    action.sa_flags = flags;
+    action.sa_flags = SA_RESTART;
     ::sigaction(signal, nullptr, &before_[i]);
     if (before_[i].sa_handler != SIG_IGN) ::sigaction(signal, &action, nullptr);
   }
 }
 
 signal_handling::~signal_handling() {
+  if (Port_Interrupt::Requested() != 0) ::alarm(0);
   for (std::size_t i = 0; i < COUNT; ++i) {
     ::sigaction(REACTIONS[i].signal, &before_[i], nullptr);
   }

@@ -28,7 +28,9 @@ char* la_new_block(std::size_t size) {
 
 std::size_t la_arena::add_block(std::size_t least) {
   std::size_t size = FIRST_BLOCK;
-  for (std::size_t i = 0; i < blocks_.size() && size < BIGGEST_BLOCK; ++i) size *= 8;
+  for (std::size_t i = 0; i < blocks_.size() && size < BIGGEST_BLOCK; ++i) {
+    size = std::min(8 * size, BIGGEST_BLOCK);
+  }
   size = std::max(size, (least + FIRST_BLOCK - 1) / FIRST_BLOCK * FIRST_BLOCK);
   end_ = blocks_.emplace_back(block(la_new_block(size))).get() + size;
   return size;

@@ -90,7 +90,7 @@ la_statement_reader::item_kind la_statement_reader::go(state next_state, item_ki
   return result;
 }
 
-/// One step on the rest of the line, which is not blank.
+/// One step on the rest of the line, which is not blank, nor begins with a blank but in quotes.
 inline la_statement_reader::item_kind la_statement_reader::step() {
   switch (state_) {
     case KEYWORD: {
