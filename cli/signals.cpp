@@ -22,7 +22,9 @@ void tick(int /*signal*/) {
 }
 
 void request(int signal) {
+  const bool ticks = Port_Interrupt::Requested() != 0;
   Port_Interrupt::Request(signal);
+  if (ticks) return;
   struct sigaction action = {};
   action.sa_handler = tick;
   ::sigaction(SIGALRM, &action, nullptr);
