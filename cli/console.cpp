@@ -3,7 +3,6 @@
 #include <poll.h>
 #include <unistd.h>
 
-#include <array>
 #include <atomic>
 #include <cerrno>
 #include <cstdio>
@@ -40,7 +39,7 @@ int descriptor = STDERR_FILENO;
 constexpr std::size_t BLOCK = 65536;
 
 /// Whether texts for a descriptor are dropped.
-std::array<bool, STDERR_FILENO + 1> is_lost = {};
+bool is_lost[STDERR_FILENO + 1] = {};
 
 std::atomic<int> hurries = 0;
 static_assert(std::atomic<int>::is_always_lock_free);
