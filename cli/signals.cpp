@@ -15,7 +15,8 @@ void stop(int /*signal*/) {
   Port_Interrupt::PassOn(SIGCONT);
 }
 
-/// Interrupts what waits for somebody who does not read, also what was about to begin to.
+/// Interrupts, without SA_RESTART, what waits for somebody who does not read, also what was about
+/// to begin to.
 void tick(int /*signal*/) {
   console::hurry();
   ::alarm(1);

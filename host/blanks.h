@@ -8,6 +8,13 @@ constexpr bool la_is_blank(char c) {
   return c == ' ' || c == '\t';
 }
 
+/// s behind the blanks at its front.
+template <class Char>
+constexpr Char* la_skip_blanks(Char* s) {
+  while (la_is_blank(*s)) ++s;
+  return s;
+}
+
 /// text without the blanks at both ends.
 constexpr std::string_view la_trimmed(std::string_view text) {
   const char* start = text.data();

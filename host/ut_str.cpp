@@ -14,11 +14,6 @@ constexpr int lower(char c) {
   return byte >= 'A' && byte <= 'Z' ? byte + ('a' - 'A') : byte;
 }
 
-const char* skip_blanks(const char* s) {
-  while (la_is_blank(*s)) ++s;
-  return s;
-}
-
 }  // namespace
 
 char* UT_STR::Copy(char* dest, const char* src, std::size_t size) {
@@ -81,12 +76,12 @@ void UT_STR::Trim(char* s) {
 }
 
 unsigned char UT_STR::AllBlank(const char* s) {
-  return *skip_blanks(s) == '\0';
+  return *la_skip_blanks(s) == '\0';
 }
 
 char UT_STR::GetToken(char* line, char* token, const char* delimiters) {
   const bool blanks_end = std::strchr(delimiters, ' ') != nullptr;
-  const char* start = skip_blanks(line);
+  const char* start = la_skip_blanks(line);
   const char* end = start + std::strcspn(start, delimiters);
   if (blanks_end) {
     const char* tab =

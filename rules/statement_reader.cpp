@@ -44,8 +44,7 @@ token take_token(char*& line, const token_ends& ends) {
 la_statement_reader::item_kind la_statement_reader::next() {
   while (!ended_) {
     item_kind item = NOTHING;
-    char* start = rest_;
-    while (la_is_blank(*start)) ++start;
+    char* start = la_skip_blanks(rest_);
     if (*start != '\0') {
       // Only in quotes the blanks count.
       if (state_ != QUOTED) rest_ = start;

@@ -168,7 +168,7 @@ TEST_F(Guest, ACommandLosesNothingToLateReadersAndDoesNotWaitForever) {
   tree.write("names", names);
   for (const auto& row : table(R"(
 2>              | nonblock | read      | 1   | kestrel-launch: 5000 names: 5000 not found
---json 2>log 1> | nonblock | read      | 1   | {"ok":true,
+--json 2>log 1> | nonblock | read      | 1   | {"ok":true,"errors":0,"warnings":0}
 2>              | block    | kill      | 143 |
 --json 2>log 1> | block    | kill      | 143 |
 --json 2>log 1> | nonblock | kill      | 143 |
