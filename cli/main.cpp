@@ -289,8 +289,13 @@ int draw_graph(const settings& set) {
 }
 
 int list_parts() {
+  bool good = true;
+  const diversion noting([&good](const Port_Msg& message) {
+    good = good && message.level != PORT_MSG_ERROR;
+    return false;
+  });
   for (const std::string& part : PM_PIC::all_parts()) console::print(part + "\n");
-  return ALL_FOUND;
+  return good ? ALL_FOUND : FAILED;
 }
 
 int print_completion(const std::string& shell) {

@@ -54,6 +54,11 @@ signal_handling::signal_handling() {
   // Whatever a netlister leaves behind comes to this process, which need not wait for another one
   // to reap it.
   ::prctl(PR_SET_CHILD_SUBREAPER, 1);
+  // A signal that was blocked when this program was started would not tick.
+  sigset_t ticks;
+  ::sigemptyset(&ticks);
+  ::sigaddset(&ticks, SIGALRM);
+  ::sigprocmask(SIG_UNBLOCK, &ticks, &mask_before_);
   for (std::size_t i = 0; i < COUNT; ++i) {
     const auto& [signal, handler] = REACTIONS[i];
     struct sigaction action = {};
@@ -66,6 +71,7 @@ signal_handling::signal_handling() {
 
 signal_handling::~signal_handling() {
   if (Port_Interrupt::Requested() != 0) ::alarm(0);
+  ::sigprocmask(SIG_SETMASK, &mask_before_, nullptr);
   for (std::size_t i = 0; i < COUNT; ++i) {
     ::sigaction(REACTIONS[i].signal, &before_[i], nullptr);
   }

@@ -20,6 +20,7 @@ class signal_handling {
  private:
   static constexpr std::size_t COUNT = 6;
   std::array<struct sigaction, COUNT> before_ = {};
+  sigset_t mask_before_ = {};
 };
 
 #endif
