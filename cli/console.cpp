@@ -72,7 +72,7 @@ void add(int its_descriptor, std::string_view text) {
 }  // namespace
 
 console::console(bool debug)
-    : is_terminal_(::isatty(STDERR_FILENO) != 0),
+    : is_terminal_(is_terminal()),
       colour_(is_terminal_ && std::getenv("NO_COLOR") == nullptr),
       before_(Port_MsgManData::setSink({show, this, debug})) {
   Port_MsgManData::setFlush([](void* /*context*/) { flush(); }, nullptr);
@@ -108,8 +108,12 @@ bool console::has_lost_results() {
   return is_lost[STDOUT_FILENO];
 }
 
+bool console::is_terminal() {
+  return ::isatty(STDERR_FILENO) != 0;
+}
+
 void console::show(void* self, const Port_Msg& message) {
-  const auto& [is_terminal, colour, before] = *static_cast<console*>(self);
+  const auto& [flushes, colour, before] = *static_cast<console*>(self);
   const appearance look = appearance_of(message.level);
   const bool coloured = colour && *look.prefix != '\0';
   if (coloured) say(look.colour);
@@ -118,7 +122,7 @@ void console::show(void* self, const Port_Msg& message) {
   const std::string_view text = message.text;
   say(text);
   if (!text.ends_with('\n')) say("\n");
-  if (is_terminal) flush();
+  if (flushes) flush();
 }
 
 diversion::diversion(std::function<bool(const Port_Msg&)> take)

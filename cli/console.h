@@ -30,7 +30,7 @@ class console {
   /// Whether a text for standard output is lost.
   static bool has_lost_results();
   /// Whether standard error is a terminal.
-  bool is_terminal() const { return is_terminal_; }
+  static bool is_terminal();
 
  private:
   static void show(void* self, const Port_Msg& message);

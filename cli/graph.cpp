@@ -35,6 +35,12 @@ std::string in_short(const std::string& path) {
   return name == 0 || name == path.npos ? path : path.substr(path.rfind('/', name - 1) + 1);
 }
 
+/// The style of the lines of a file of rules. With more files than styles, they begin again.
+const char* style_of(std::size_t file) {
+  constexpr std::array STYLES = {"solid", "dashed", "dotted", "bold"};
+  return STYLES[file % STYLES.size()];
+}
+
 std::string edge(const LA_RULE& rule, const char* style, const char* colour) {
   std::string label = rule.rule_name.get();
   if (const char* name = rule.netlist_file->get_name()) label.append(" for ").append(name);
@@ -46,19 +52,18 @@ std::string edge(const LA_RULE& rule, const char* style, const char* colour) {
 }  // namespace
 
 std::string graph_of(const LA_RULE_SET& set) {
-  constexpr std::array STYLES = {"solid", "dashed", "dotted"};
   const std::vector<relation> relations = relations_of(set);
   std::string edges;
   std::string legend;
   int i = 0;
   for (std::size_t file = 0; file < set.files.size(); ++file) {
-    legend.append(STYLES[file]).append(": ").append(in_short(set.files[file].path)).append("\n");
+    legend.append(style_of(file)).append(": ").append(in_short(set.files[file].path)).append("\n");
     for (const int end = i + set.files[file].num_rules; i < end; ++i) {
       const relation& to_others = relations[static_cast<std::size_t>(i)];
       const char* colour = to_others.overridden_by != nullptr ? ", color=grey, fontcolor=grey"
                            : to_others.is_in_loop             ? ", color=red, fontcolor=red"
                                                               : "";
-      edges += edge(*set.rules.elements[i], STYLES[file], colour);
+      edges += edge(*set.rules.elements[i], style_of(file), colour);
     }
   }
   return "digraph rules {\n"

@@ -128,6 +128,10 @@ class command_line {
 
 }  // namespace
 
+bool takes_names(task what) {
+  return what == task::RESOLVE || what == task::EXPLAIN;
+}
+
 std::span<const option> all_options() {
   return OPTIONS;
 }
@@ -137,8 +141,7 @@ std::string read_command_line(int count, const char* const* words, settings& to)
   // The launcher counts both in 16 bits.
   if (to.search_dirs.size() > SHRT_MAX) return "there are too many search directories";
   if (to.libraries.size() > SHRT_MAX) return "there are too many library entries";
-  const bool needs_names = to.what == task::RESOLVE || to.what == task::EXPLAIN;
-  if (needs_names && to.names.empty() && to.names_files.empty()) {
+  if (takes_names(to.what) && to.names.empty() && to.names_files.empty()) {
     return "no netlist is named";
   }
   return {};

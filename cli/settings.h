@@ -19,6 +19,9 @@ enum class task {
   VERSION
 };
 
+/// Whether a task works on names.
+bool takes_names(task what);
+
 /// The settings of one call. Texts that are pointers belong to the command line.
 struct settings {
   task what = task::RESOLVE;

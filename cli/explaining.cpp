@@ -1,0 +1,32 @@
+// Explaining what would be done for names.
+#include <string>
+
+#include "cli/console.h"
+#include "cli/explain.h"
+#include "cli/launching.h"
+#include "cli/tasks.h"
+#include "launcher/baslauncher.h"
+
+int explain(const settings& set) {
+  LA_LAUNCHER launcher = launcher_of(set);
+  int status = launcher.ok ? ALL_FOUND : FAILED;
+  std::string error;
+  // The explanation says what the messages say, and the errors are its answers.
+  const diversion diverted([&error](const Port_Msg& message) {
+    if (message.level == PORT_MSG_ERROR) error += message.text;
+    return message.level != PORT_MSG_WARNING;
+  });
+  for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
+    if (i > 0) console::print("\n");
+    LA_EXPLANATION why;
+    launcher.explain_to(&why);
+    char source[LA_MAX_PATH];
+    char netlist[LA_MAX_PATH];
+    error.clear();
+    const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
+    console::print(explained({set.names[i], result, netlist, error}, why));
+    console::flush();
+    status = worse(status, result);
+  }
+  return status;
+}
