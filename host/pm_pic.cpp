@@ -21,7 +21,7 @@ la_text entry(const StaticAcdRead& table, const char* device, short field, short
 /// The device of the table that name begins with, as a whole or up to a "-"; the longest of them.
 std::string device_of(const StaticAcdRead& table, const std::string& name) {
   std::string longest;
-  for (const auto& [device, value] : table.entries()) {
+  for (const auto& [device, value, line] : table.entries()) {
     const char after = name.c_str()[std::min(device.size(), name.size())];
     if (device.size() > longest.size() && (after == '\0' || after == '-') &&
         UT_STR::INCompare(name.c_str(), device.data(), device.size()) == 0) {
@@ -70,7 +70,7 @@ std::vector<std::string> PM_PIC::all_parts() {
   for (const Port::StringBase<char>& root : Port::CvnenvPath::GetInstance()) {
     const std::string path = std::string(root.c_str()) + "/data/devices.acd";
     const StaticAcdRead table(path.c_str(), nullptr, nullptr, 1, 0, 1);
-    for (const auto& [key, value] : table.entries()) {
+    for (const auto& [key, value, line] : table.entries()) {
       const std::string device(key);
       if (!known.insert(device).second) continue;
       const auto packaged = extended({device}, table, device.c_str(), PACKAGE_FIELD);

@@ -46,7 +46,7 @@ StaticAcdRead::StaticAcdRead(const char* path, const char* /*unused*/, char* con
     const std::size_t end = text_.find('\n', start);
     std::string_view line = std::string_view(text_).substr(start, end - start);
     if (end != text_.npos && line.ends_with('\r')) line.remove_suffix(1);
-    if (!read_line(line)) {
+    if (!read_line(line, number)) {
       message().issueError("Launcher: \"%s\", line %d: Expecting KEY = VALUE\n", path, number);
       valid_ = false;
     }
@@ -58,7 +58,7 @@ StaticAcdRead::StaticAcdRead(const char* path, const char* /*unused*/, char* con
   }
 }
 
-bool StaticAcdRead::read_line(std::string_view line) {
+bool StaticAcdRead::read_line(std::string_view line, int number) {
   line = without_comment(line);
   const std::string_view content = la_trimmed(line);
   if (content.empty()) return true;
@@ -75,7 +75,7 @@ bool StaticAcdRead::read_line(std::string_view line) {
   last_value_ = &passed_over_;
   if (known == la_hash_index::NONE) {
     known = static_cast<int>(entries_.size());
-    last_value_ = &entries_.emplace_back(entry{key, {}}).value;
+    last_value_ = &entries_.emplace_back(entry{key, {}, number}).value;
   }
   *last_value_ = la_trimmed(content.substr(equals + 1));
   return true;
@@ -90,15 +90,24 @@ std::string_view StaticAcdRead::joined(std::string_view value, std::string_view 
   return {start, value.size() + 1 + content.size()};
 }
 
-std::string_view StaticAcdRead::value(std::string_view key) const {
+const StaticAcdRead::entry* StaticAcdRead::find(std::string_view key) const {
   // Most keys are asked for in the order of the file.
   const std::size_t next = last_found_ + 1;
-  if (next < entries_.size() && entries_[next].key == key)
-    return entries_[last_found_ = next].value;
+  if (next < entries_.size() && entries_[next].key == key) return &entries_[last_found_ = next];
   const int number = index_.find(la_hash(key), is_key(key));
-  if (number == la_hash_index::NONE) return {};
+  if (number == la_hash_index::NONE) return nullptr;
   last_found_ = static_cast<std::size_t>(number);
-  return entries_[last_found_].value;
+  return &entries_[last_found_];
+}
+
+std::string_view StaticAcdRead::value(std::string_view key) const {
+  const entry* found = find(key);
+  return found != nullptr ? found->value : std::string_view();
+}
+
+int StaticAcdRead::line(std::string_view key) const {
+  const entry* found = find(key);
+  return found != nullptr ? found->line : 0;
 }
 
 Port::StringBase<char> StaticAcdRead::GetStringByKey(const char* key, const char* separator,

@@ -21,6 +21,7 @@ class StaticAcdRead {
   struct entry {
     std::string_view key;
     std::string_view value;
+    int line;  ///< of the key, from 1
   };
 
   /// Reads the file at path; a missing one holds no keys. A file that cannot be read holds none
@@ -40,6 +41,8 @@ class StaticAcdRead {
   /// The same without copies, for who wants all of the fields: the value of key, null when it does
   /// not exist, which is good as long as this object.
   std::string_view value(std::string_view key) const;
+  /// The line where key stands, from 1; 0 when it does not exist.
+  int line(std::string_view key) const;
   /// Takes the first field from the front of such a text, which is null after the last one.
   static std::string_view take_piece(std::string_view& text, char separator) {
     const std::size_t end = text.find(separator);
@@ -54,7 +57,8 @@ class StaticAcdRead {
 
  private:
   /// False when the line is not of the form above; it is then passed over.
-  bool read_line(std::string_view line);
+  bool read_line(std::string_view line, int number);
+  const entry* find(std::string_view key) const;
   auto is_key(std::string_view key) const {
     return [this, key](int number) { return la_at(entries_, number).key == key; };
   }

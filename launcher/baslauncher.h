@@ -84,6 +84,8 @@ class LA_LAUNCHER {
   /// From now on find adds what it sees and decides to this object, which stays the caller's; null
   /// ends that.
   void explain_to(LA_EXPLANATION* to) { explanation = to; }
+  /// The rules, which live as long as the launcher.
+  const LA_RULE_SET& rule_set() const { return *rules; }
 
   /// 1 when the rules were loaded and passed their checks.
   unsigned char ok = 0;

@@ -508,8 +508,9 @@ static_assert(LA_MAX_PATH == 260 && la_statement_reader::MAX_LINES == 32767);
 
 class user_rules_loader {
  public:
-  user_rules_loader(const char* file_name, Port::Stream& stream, la_arena& arena)
-      : file_name_(file_name), reader_(stream), arena_(arena) {}
+  /// file_name is the name in messages, path the full one.
+  user_rules_loader(const char* file_name, const char* path, Port::Stream& stream, la_arena& arena)
+      : file_name_(file_name), path_(path), reader_(stream), arena_(arena) {}
 
   /// Reads the whole file into rules. Returns whether there was no error.
   bool read() {
@@ -520,6 +521,7 @@ class user_rules_loader {
         take_statement(reader_.keyword(), reader_.value());
       } else if (item == la_statement_reader::UNEXPECTED_END) {
         message().issueError("Launcher: Unexpected end of file\n");
+        unfinished_ = here();
         good_ = false;
       } else {
         report("%s", finding_text(item));
@@ -529,6 +531,8 @@ class user_rules_loader {
     return good_;
   }
 
+  /// The statement that the end of the file has cut off.
+  const LA_ORIGIN& unfinished_statement() const { return unfinished_; }
   bool validate() const { return validate_rules(named_.rules) && validate_rules(extension_.rules); }
 
   /// Rules for named files come first, as they are the more special ones.
@@ -542,6 +546,7 @@ class user_rules_loader {
     if (is_same(keyword, "RuleName")) {
       finish_rule();
       rule_.reset(arena_.make<LA_RULE>(value, &arena_));
+      rule_->origin = here();
       return;
     }
     if (!rule_) return report("%s", "Rule does not have a RuleName");
@@ -559,6 +564,9 @@ class user_rules_loader {
     (named ? named_ : extension_).add(std::move(rule_));
   }
 
+  /// Where the current statement begins.
+  LA_ORIGIN here() const { return {path_, reader_.statement_line()}; }
+
   void report(const char* finding, const char* argument, int line = __builtin_LINE()) {
     const std::string format = std::string("Launcher: \"%s\", line %d: ") + finding + "\n";
     message(line).issueError(format.c_str(), file_name_, reader_.line(), argument);
@@ -566,8 +574,10 @@ class user_rules_loader {
   }
 
   const char* file_name_;
+  std::string path_;
   la_statement_reader reader_;
   bool good_ = true;
+  LA_ORIGIN unfinished_;
   la_arena& arena_;
   owned_rule rule_;
   rule_batch named_;
@@ -607,8 +617,9 @@ bool LA_RULE_SET::load_user_rules(const char* file_name) {
     message().issueError("Launcher: Could not open user rules file \"%s\".\n", file_name);
     return false;
   }
-  user_rules_loader loader(file_name, *stream, arena_);
+  user_rules_loader loader(file_name, full_name, *stream, arena_);
   const bool good = loader.read() && loader.validate();
+  unfinished_statement = loader.unfinished_statement();
   loader.move_to(rules);
   add_file(file.get_fullfile());
   return good;
@@ -636,7 +647,7 @@ std::string system_rules_file(PM_PIC& device) {
 class system_rules_loader {
  public:
   system_rules_loader(const char* path, la_arena& arena)
-      : reader_(path, nullptr, nullptr, 1, 0, 1), arena_(arena) {}
+      : path_(path), reader_(path, nullptr, nullptr, 1, 0, 1), arena_(arena) {}
 
   /// Reads all rules. Returns whether there was no error.
   bool read() {
@@ -660,6 +671,7 @@ class system_rules_loader {
  private:
   void read_rule(const char* name) {
     owned_rule rule(arena_.make<LA_RULE>(name, &arena_));
+    rule->origin = {path_, reader_.line(name)};
     if (UT_STR::Len(name) >= LA_MAX_PATH) refuse_length(name, "The name");
     record_.assign(reader_.value(name));
     std::string_view record = record_;
@@ -735,6 +747,7 @@ class system_rules_loader {
     good_ = false;
   }
 
+  std::string path_;
   StaticAcdRead reader_;
   la_arena& arena_;
   std::string record_;  ///< of the current rule, to be cut into its fields

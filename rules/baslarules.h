@@ -58,6 +58,12 @@ bool parse_status(const char* text, unsigned short& op, int& code);
 using DARRAY_LA_STATUS_PTR = UT_TYPED_DARRAY<LA_STATUS*>;
 using DARRAY_LA_FILE_PTR = UT_TYPED_DARRAY<LA_FILE*>;
 
+/// A place in a file; the line counts from 1, and is 0 where there is no such place.
+struct LA_ORIGIN {
+  std::string file;
+  int line = 0;
+};
+
 /// One rule. All that its fields hold is its own, and ends with it. A text that is absent is null.
 class LA_RULE {
  public:
@@ -136,6 +142,9 @@ class LA_RULE {
   std::unique_ptr<LA_DIR> checker_dir;
   DARRAY_LA_STATUS_PTR netlister_status;
   DARRAY_LA_STATUS_PTR checker_status;
+  /// Where the rule begins: the file, as LA_RULE_SET::files names it, and the line of its RuleName
+  /// or of its record. No line for a rule that no loader made.
+  LA_ORIGIN origin;
 };
 
 using DARRAY_LA_RULE_PTR = UT_TYPED_DARRAY<LA_RULE*>;
@@ -172,6 +181,9 @@ class LA_RULE_SET {
   DARRAY_LA_RULE_PTR rules;
   /// Where the rules come from, in their order.
   std::vector<LA_RULES_FILE> files;
+  /// When "Unexpected end of file" was issued, where the statement begins that lacks its end; else
+  /// no line.
+  LA_ORIGIN unfinished_statement;
 
  private:
   void add_file(const std::string& path);

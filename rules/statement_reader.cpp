@@ -93,6 +93,7 @@ la_statement_reader::item_kind la_statement_reader::go(state next_state, item_ki
 inline la_statement_reader::item_kind la_statement_reader::step() {
   switch (state_) {
     case KEYWORD: {
+      statement_line_ = line_number_;
       const token keyword = take_token(rest_, KEYWORD_ENDS);
       keyword.copy_to(keyword_);
       if (keyword.end == ' ') return go(EQUALS);

@@ -38,6 +38,8 @@ class la_statement_reader {
   const char* value() const { return value_; }
   /// The line that was read last, from 1.
   int line() const { return line_number_; }
+  /// The line where the last statement began, whether it is complete, unfinished or being dropped.
+  int statement_line() const { return statement_line_; }
 
  private:
   enum state { KEYWORD, EQUALS, VALUE, QUOTED, SEMICOLON, SKIP };
@@ -55,6 +57,7 @@ class la_statement_reader {
   Port::Stream& stream_;
   state state_ = KEYWORD;
   int line_number_ = 0;
+  int statement_line_ = 0;
   bool value_refused_ = false;
   bool ended_ = false;
   char line_[LA_MAX_PATH] = "";

@@ -20,7 +20,7 @@ void examine(const std::string& input, Tree& tree) {
   tree.write("share/data/devices.acd", input.substr(name.size()));
   EXPECT_EQ(spelled(lower(name).c_str()), spelled(name.c_str()));
   const StaticAcdRead table("share/data/devices.acd", nullptr, nullptr, 1, 0, 1);
-  for (const auto& [key, value] : table.entries()) {
+  for (const auto& [key, value, line] : table.entries()) {
     EXPECT_EQ(spelled(std::string(key).c_str()).empty(), !table.valid()) << key;
   }
 }
