@@ -14,11 +14,18 @@ namespace Port {
 
 namespace {
 
+constexpr __int64 SECOND = 1'000'000'000;
+
 __int64 nanoseconds(const timespec& time) {
   // The years 1678 to 2262 fit; a time stamp outside them counts as the end that it lies beyond.
-  constexpr __int64 SECOND = 1'000'000'000;
   constexpr __int64 LIMIT = INT64_MAX / SECOND - 1;
   return std::clamp<__int64>(time.tv_sec, -LIMIT, LIMIT) * SECOND + time.tv_nsec;
+}
+
+/// The system takes the nearest time that the file system can hold. The time of access stays.
+bool set_modification_time(const char* path, const timespec& time) {
+  const timespec times[] = {{0, UTIME_OMIT}, time};
+  return ::utimensat(AT_FDCWD, path, times, 0) == 0;
 }
 
 }  // namespace
@@ -85,10 +92,20 @@ bool Place::enter() const {
   return ::fchdir(descriptor_) == 0;
 }
 
+bool FileStatus::is_left_by_failed_run() const {
+  constexpr __int64 START_OF_1902 = -2'145'916'800 * SECOND;
+  return exists && time < START_OF_1902;
+}
+
 FileStatus File::status(const char* path) {
   struct stat found = {};
   if (::stat(path, &found) != 0 || S_ISDIR(found.st_mode)) return {};
-  return {true, nanoseconds(found.st_mtim)};
+  return {true,
+          nanoseconds(found.st_mtim),
+          nanoseconds(found.st_ctim),
+          found.st_dev,
+          found.st_ino,
+          found.st_size};
 }
 
 bool File::exist(const char* path) {
@@ -118,10 +135,14 @@ bool File::getdatetime(const char* path, __int64& time) {
   return found.exists;
 }
 
+bool File::settime(const char* path, __int64 time) {
+  // The nanoseconds count from the start of the second, also before 1970.
+  const __int64 part = (time % SECOND + SECOND) % SECOND;
+  return set_modification_time(path, {(time - part) / SECOND, part});
+}
+
 bool File::setoldest(const char* path) {
-  // The system takes the nearest time that the file system can hold.
-  const timespec times[] = {{0, UTIME_OMIT}, {std::numeric_limits<time_t>::min(), 0}};
-  return ::utimensat(AT_FDCWD, path, times, 0) == 0;
+  return set_modification_time(path, {std::numeric_limits<time_t>::min(), 0});
 }
 
 bool File::remove(const char* path) {

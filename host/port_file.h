@@ -52,10 +52,24 @@ class Stream {
   const char* end_ = nullptr;
 };
 
-/// What the file system knows of a name.
+/// What the file system knows of a name. All zero when there is no such file. Times are in
+/// nanoseconds since 1970.
 struct FileStatus {
   bool exists = false;  ///< there is such a file, and it is not a directory
-  __int64 time = 0;     ///< modification time, in nanoseconds since 1970; 0 when there is none
+  __int64 time = 0;     ///< modification time
+  __int64 changed = 0;  ///< when the status last changed; no program can set that
+  std::uint64_t device = 0;
+  std::uint64_t inode = 0;
+  __int64 size = 0;  ///< in bytes
+
+  /// Whether the file has the time stamp with which a failed run leaves its output: before 1902
+  /// (see File::setoldest). Files that have no true stamp are dated 1970 or 1980.
+  bool is_left_by_failed_run() const;
+  /// Whether this is in every respect the file that it was.
+  friend bool operator==(const FileStatus& a, const FileStatus& b) {
+    return a.exists == b.exists && a.time == b.time && a.changed == b.changed &&
+           a.device == b.device && a.inode == b.inode && a.size == b.size;
+  }
 };
 
 /// The directory that is current when this is made, by whatever name it goes later.
@@ -76,7 +90,7 @@ class Place {
 /// The files of the process, by their names in either form.
 class File {
  public:
-  /// Existence and modification time of path, with one question to the file system.
+  /// What is known of path, with one question to the file system.
   static FileStatus status(const char* path);
   /// True when there is anything but a directory at path.
   static bool exist(const char* path);
@@ -89,6 +103,8 @@ class File {
   /// Sets time to the modification time of path, in nanoseconds since 1970. Returns false, and
   /// leaves time alone, when there is no such file.
   static bool getdatetime(const char* path, __int64& time);
+  /// Sets the modification time of path, in nanoseconds since 1970. Returns false when that fails.
+  static bool settime(const char* path, __int64 time);
   /// Sets the modification time of path to the oldest that its file system knows. Returns false
   /// when that fails.
   static bool setoldest(const char* path);

@@ -81,6 +81,21 @@ TEST_F(Host, LinesAcrossBlocks) {
   EXPECT_TRUE(stream->geteof() && !stream->failed());
 }
 
+TEST_F(Host, TimeStamps) {
+  tree.make("f g");
+  const Port::FileStatus before = Port::File::status("f");
+  EXPECT_TRUE(before == Port::File::status("f") && !(before == Port::File::status("g")));
+  for (const __int64 time : {1'500'000'001, 0, -1, -1'000'000'000, -1'000'000'001}) {
+    EXPECT_TRUE(Port::File::settime("f", time));
+    EXPECT_EQ(Port::File::status("f").time, time);
+  }
+  Port::File::settime("f", before.time);
+  EXPECT_FALSE(before == Port::File::status("f"));  // It was touched.
+  EXPECT_FALSE(Port::File::status("f").is_left_by_failed_run());
+  EXPECT_TRUE(Port::File::setoldest("f") && Port::File::status("f").is_left_by_failed_run());
+  EXPECT_FALSE(Port::File::settime("missing", 0) || Port::FileStatus().is_left_by_failed_run());
+}
+
 TEST_F(Host, Messages) {
   Messages outer;
   {
