@@ -116,10 +116,6 @@ void UT_STR::Lower(char* s) {
   for (; *s != '\0'; ++s) *s = static_cast<char>(lower(*s));
 }
 
-int UT_STR::IsAlpha(int c) {
-  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
-}
-
 la_text::la_text(const char* chars, std::size_t length, la_arena* arena) {
   if (chars == nullptr) {
     room_[LAST] = ABSENT;

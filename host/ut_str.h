@@ -55,7 +55,7 @@ class UT_STR {
   /// Turns letters into lower case, in place.
   static void Lower(char* s);
   /// Non-zero for a letter.
-  static int IsAlpha(int c);
+  static int IsAlpha(int c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
 };
 
 /// A string of its own, or none. Copies are deep. Short strings are kept in place: a move moves

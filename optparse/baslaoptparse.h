@@ -1,4 +1,4 @@
-// Option strings: the table of keywords and the template language of netlister options.
+// The table of keywords, and the template language of netlister options.
 //
 // A template is text with
 //   $name     a keyword reference: "$", any character, then letters and underscores
@@ -9,9 +9,7 @@
 #ifndef KESTREL_OPTPARSE_BASLAOPTPARSE_H
 #define KESTREL_OPTPARSE_BASLAOPTPARSE_H
 
-#include <cstddef>
-#include <cstdint>
-#include <vector>
+#include <string>
 
 #include "host/ut_darray.h"
 #include "host/ut_str.h"
@@ -32,14 +30,8 @@ class LA_KEYWORD_ENTRY {
   /// Issues one status message for each value.
   void dump() const;
 
-  la_text name;
-  std::size_t name_length;
-  std::uint64_t head = 0;               ///< the first characters of the name, padded with zeros
-  std::uint64_t mask = 0;               ///< ones where head has characters
-  DARRAY_NAME values;                   ///< at least one in a table
-  std::vector<std::ptrdiff_t> lengths;  ///< of the values
-  bool has_stray = false;               ///< whether a value has, or had, a "}" or "]"
-  LA_KEYWORD_ENTRY* next = nullptr;     ///< in the table's chain
+  const std::string name;
+  DARRAY_NAME values;  ///< at least one in a table
 };
 
 using DARRAY_LA_KEYWORD_ENTRY_PTR = UT_TYPED_DARRAY<LA_KEYWORD_ENTRY*>;
@@ -52,7 +44,7 @@ class LA_KEYWORD_TABLE {
   LA_KEYWORD_TABLE& operator=(const LA_KEYWORD_TABLE&) = delete;
   ~LA_KEYWORD_TABLE();
 
-  /// Gives the keyword this value alone; null means no value. Names are compared exactly.
+  /// Makes value the only one of the keyword; null means no value. Names are compared exactly.
   void set_keyword(const char* name, const char* value);
   /// Appends a value to those of the keyword.
   void add_keyword(const char* name, const char* value);
@@ -63,8 +55,8 @@ class LA_KEYWORD_TABLE {
   unsigned char expand(char* options, int size = LA_MAX_PATH) const {
     return expand(options, options, size);
   }
-  /// The same for a template that stays where it is: what is said of options goes for result, a
-  /// buffer of size characters that has room for the template, too.
+  /// The same for a template that stays where it is: result, a buffer of size characters with room
+  /// for the template, then holds what options holds above.
   unsigned char expand(const char* options, char* result, int size) const;
   /// Issues one status message for each value of each keyword.
   void dump() const;
@@ -73,9 +65,6 @@ class LA_KEYWORD_TABLE {
   LA_KEYWORD_ENTRY& entry(const char* name);
 
   DARRAY_LA_KEYWORD_ENTRY_PTR entries;
-  /// The keywords that a reference may begin with, by its first character, chained in their order:
-  /// the first that it does begin with, in any case of letters, is the one that it means.
-  LA_KEYWORD_ENTRY* first_[32] = {};
 };
 
 #endif
