@@ -25,7 +25,7 @@ int check(const settings& set) {
   if (rules.is_valid) hints = hints_on(rules);
   for (std::string& hint : hints) hint.insert(0, "hint: ");
   complain(hints);
-  if (set.json) print_totals(rules.is_valid, 0, 0);
+  if (set.json) print_totals(rules.is_valid);
   if (!set.json && rules.is_valid) {
     console::print("Rules checked: " + std::to_string(rules.rules.count) + ", all good\n");
   }

@@ -3,6 +3,7 @@
 #include <poll.h>
 #include <unistd.h>
 
+#include <array>
 #include <atomic>
 #include <cerrno>
 #include <cstdio>
@@ -32,6 +33,10 @@ constexpr appearance appearance_of(Port_MsgLevel level) {
       return {"", ""};
   }
 }
+
+constexpr const char* OURSELVES = "kestrel-launch";
+
+std::array<int, PORT_MSG_DEBUG + 1> counts = {};
 
 /// What is still to be written, and where. Only one text waits at a time: so all come in order.
 std::string waiting;
@@ -108,12 +113,21 @@ bool console::has_lost_results() {
   return is_lost[STDOUT_FILENO];
 }
 
+int console::count(Port_MsgLevel level) {
+  return counts[level];
+}
+
 bool console::is_terminal() {
   return ::isatty(STDERR_FILENO) != 0;
 }
 
 void console::show(void* self, const Port_Msg& message) {
   const auto& [flushes, colour, before] = *static_cast<console*>(self);
+  ++counts[message.level];
+  if (message.program == OURSELVES) {
+    complain(message.text);
+    return;
+  }
   const appearance look = appearance_of(message.level);
   const bool coloured = colour && *look.prefix != '\0';
   if (coloured) say(look.colour);
@@ -126,7 +140,9 @@ void console::show(void* self, const Port_Msg& message) {
 }
 
 diversion::diversion(std::function<bool(const Port_Msg&)> take)
-    : take_(std::move(take)), before_(Port_MsgManData::setSink({show, this, false})) {}
+    : take_(std::move(take)), before_(Port_MsgManData::setSink({show, this, false})) {
+  Port_MsgManData::setSink({show, this, before_.debug});
+}
 
 diversion::~diversion() {
   Port_MsgManData::setSink(before_);
@@ -144,6 +160,14 @@ void complain(const std::string& text) {
 void complain(const std::vector<std::string>& texts) {
   for (const std::string& text : texts) console::say("kestrel-launch: " + text + "\n");
   console::flush();
+}
+
+void complain(Port_MsgLevel level, const std::string& text) {
+  Port_MsgManData& message =
+      Port_MsgManData::createObject(OURSELVES, "cli/console.cpp", __LINE__, "");
+  const auto issue =
+      level == PORT_MSG_ERROR ? &Port_MsgManData::issueError : &Port_MsgManData::issueWarning;
+  (message.*issue)("%s", text.c_str());
 }
 
 std::string json_string(std::string_view text) {

@@ -29,6 +29,8 @@ class console {
   static void hurry();
   /// Whether a text for standard output is lost.
   static bool has_lost_results();
+  /// How many messages of this level have been shown.
+  static int count(Port_MsgLevel level);
   /// Whether standard error is a terminal.
   static bool is_terminal();
 
@@ -41,6 +43,7 @@ class console {
 };
 
 /// Takes messages away, until it is destroyed. Those that take says no to are shown as before.
+/// Debug traces come if they came before.
 class diversion {
  public:
   explicit diversion(std::function<bool(const Port_Msg&)> take);
@@ -58,6 +61,8 @@ class diversion {
 /// Says on standard error, at once, what the command itself has to say: a line for each text.
 void complain(const std::string& text);
 void complain(const std::vector<std::string>& texts);
+/// Says what is to count as a message of this level, and to go where those of the library go.
+void complain(Port_MsgLevel level, const std::string& text);
 
 /// text as a JSON string. A byte that is not UTF-8 becomes the lone surrogate U+DC00 + byte.
 std::string json_string(std::string_view text);

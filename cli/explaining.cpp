@@ -14,7 +14,7 @@ int explain(const settings& set) {
   // The explanation says what the messages say, and the errors are its answers.
   const diversion diverted([&error](const Port_Msg& message) {
     if (message.level == PORT_MSG_ERROR) error += message.text;
-    return message.level != PORT_MSG_WARNING;
+    return message.level != PORT_MSG_WARNING && message.level != PORT_MSG_DEBUG;
   });
   for (std::size_t i = 0; launcher.ok && i < set.names.size(); ++i) {
     if (i > 0) console::print("\n");

@@ -12,10 +12,10 @@ std::string complete_directories(settings& set) {
     if (full_name == nullptr) return "--search-dir: not the name of a directory: \"" + dir + "\"";
     dir = full_name;
   }
-  if (set.output_dir != nullptr && !Port::File::isdirectory(set.output_dir)) {
-    return std::string("--output-dir: there is no directory \"") + set.output_dir + "\"";
-  }
-  return {};
+  if (set.output_dir == nullptr) return {};
+  const char* output_dir = LA_DIR(set.output_dir).get_dir();
+  if (output_dir != nullptr && Port::File::isdirectory(output_dir)) return {};
+  return std::string("--output-dir: there is no directory \"") + set.output_dir + "\"";
 }
 
 LA_LAUNCHER launcher_of(const settings& set) {

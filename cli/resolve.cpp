@@ -1,7 +1,9 @@
 // Resolving names.
 #include <algorithm>
 #include <cstdlib>
+#include <filesystem>
 #include <string>
+#include <system_error>
 #include <vector>
 
 #include "cli/console.h"
@@ -21,16 +23,55 @@ bool is_dry_run() {
 }
 
 /// Whether netlisters that say that they have done their work have written the file to read.
-bool is_written(const char* source, const char* netlist) {
+bool is_written(const resolution& found) {
+  const char* netlist = found.netlist.c_str();
   const Port::FileStatus status = Port::File::status(netlist);
   if (!status.exists) {
-    const bool is_directory = Port::File::isdirectory(netlist);
-    complain(is_directory ? std::string(netlist) + " is a directory"
-                          : std::string("no netlister has written ") + netlist);
-  } else if (status.time < Port::File::status(source).time) {
-    complain(std::string(netlist) + " is older than its source: the next call makes it again");
+    complain(PORT_MSG_ERROR, Port::File::isdirectory(netlist)
+                                 ? found.netlist + " is a directory"
+                                 : "no netlister has written " + found.netlist);
+  } else if (status.time < Port::File::status(found.source.c_str()).time) {
+    complain(PORT_MSG_WARNING,
+             found.netlist + " is older than its source: the next call makes it again");
   }
   return status.exists;
+}
+
+/// A name as it is seen from everywhere. Without rules, the library leaves relative ones as they
+/// are.
+std::string full_name(const char* path) {
+  std::error_code failure;
+  const std::filesystem::path full = std::filesystem::absolute(path, failure);
+  return failure || *path == '\0' ? path : full.string();
+}
+
+/// Resolves one name.
+resolution resolved(LA_LAUNCHER& launcher, const std::string& name, bool top) {
+  resolution found = {name, LA_FAILED, "", "", false, 0, ""};
+  const diversion watching([&found](const Port_Msg& message) {
+    if (message.level == PORT_MSG_WARNING) ++found.warnings;
+    if (message.level == PORT_MSG_ERROR && found.error.empty()) {
+      found.error = message.text;
+      if (found.error.ends_with('\n')) found.error.pop_back();
+    }
+    return false;
+  });
+  char source[LA_MAX_PATH];
+  char netlist[LA_MAX_PATH];
+  const int runs_before = launcher.runs;
+  found.result = launcher.find(name.c_str(), source, netlist, top);
+  found.is_built = launcher.runs > runs_before;
+  found.source = source;
+  found.netlist = full_name(netlist);
+  if (found.result == LA_FOUND && !launcher.saw_netlist() && !is_dry_run() && !is_written(found)) {
+    found.result = LA_FAILED;
+  }
+  if (found.result == LA_FAILED) {
+    found.source.clear();
+    found.netlist.clear();
+    found.is_built = false;
+  }
+  return found;
 }
 
 /// Shows a person which of many names is resolved.
@@ -52,26 +93,15 @@ int resolve(const settings& set) {
     return Port_Interrupt::Requested() == 0 && !console::has_lost_results();
   };
   for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
-    const std::string& name = set.names[i];
     show_progress(i, set.names);
-    char source[LA_MAX_PATH];
-    char netlist[LA_MAX_PATH];
-    const int runs_before = launcher.runs;
-    short result = launcher.find(name.c_str(), source, netlist, set.top);
-    const bool is_built = launcher.runs > runs_before;
-    if (result == LA_FOUND && !launcher.saw_netlist() && !is_dry_run() &&
-        !is_written(source, netlist)) {
-      result = LA_FAILED;
-      source[0] = '\0';
-      netlist[0] = '\0';
-    }
-    print_result(set, name, result, source, netlist);
-    if (result == LA_NOT_FOUND) complain("not found: " + name);
-    counted.add(result, is_built);
-    status = worse(status, result);
+    const resolution found = resolved(launcher, set.names[i], set.top);
+    print_result(set, found);
+    if (found.result == LA_NOT_FOUND) complain("not found: " + found.name);
+    counted.add(found);
+    status = worse(status, found.result);
   }
   counted.tell(set.names.size(), is_dry_run());
-  if (set.json) print_totals(launcher.ok, launcher.errors, launcher.warnings);
+  if (set.json) print_totals(launcher.ok);
   // While signals are still handled: whoever reads may have left.
   console::flush();
   return status;

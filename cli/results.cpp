@@ -3,30 +3,33 @@
 #include "cli/console.h"
 #include "launcher/baslauncher.h"
 
-void print_result(const settings& set, const std::string& name, short result, const char* source,
-                  const char* netlist) {
+void print_result(const settings& set, const resolution& of) {
   if (set.json) {
-    console::print("{\"name\":" + json_string(name) + ",\"result\":" + std::to_string(result) +
-                   ",\"source\":" + json_string(source) + ",\"netlist\":" + json_string(netlist) +
-                   "}\n");
-  } else if (result == LA_FOUND) {
-    console::print(netlist);
-    console::print("\n");
+    std::string line =
+        "{\"name\":" + json_string(of.name) + ",\"result\":" + std::to_string(of.result) +
+        ",\"source\":" + json_string(of.source) + ",\"netlist\":" + json_string(of.netlist) +
+        ",\"built\":" + (of.is_built ? "true" : "false") +
+        ",\"warnings\":" + std::to_string(of.warnings);
+    if (of.result == LA_FAILED) line += ",\"error\":" + json_string(of.error);
+    console::print(line + "}\n");
+  } else if (of.result == LA_FOUND) {
+    console::print(of.netlist + "\n");
   }
   // Whoever reads the results need not wait for the last of them.
   console::flush();
 }
 
-void print_totals(bool ok, int errors, int warnings) {
-  console::print(std::string("{\"ok\":") + (ok ? "true" : "false") + ",\"errors\":" +
-                 std::to_string(errors) + ",\"warnings\":" + std::to_string(warnings) + "}\n");
+void print_totals(bool ok) {
+  console::print(std::string("{\"ok\":") + (ok ? "true" : "false") +
+                 ",\"errors\":" + std::to_string(console::count(PORT_MSG_ERROR)) +
+                 ",\"warnings\":" + std::to_string(console::count(PORT_MSG_WARNING)) + "}\n");
 }
 
-void tally::add(short result, bool is_built) {
-  ++(result == LA_FAILED      ? failed_
-     : result == LA_NOT_FOUND ? not_found_
-     : is_built               ? built_
-                              : up_to_date_);
+void tally::add(const resolution& next) {
+  ++(next.result == LA_FAILED      ? failed_
+     : next.result == LA_NOT_FOUND ? not_found_
+     : next.is_built               ? built_
+                                   : up_to_date_);
 }
 
 void tally::tell(std::size_t names, bool is_dry_run) const {

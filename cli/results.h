@@ -7,17 +7,27 @@
 
 #include "cli/settings.h"
 
-/// Prints the result of one name: its netlist if it was found, or a line of JSON.
-void print_result(const settings& set, const std::string& name, short result, const char* source,
-                  const char* netlist);
+/// What became of one name.
+struct resolution {
+  std::string name;
+  short result;
+  std::string source;
+  std::string netlist;
+  bool is_built;      ///< a netlister has been run for it, or would be
+  int warnings;       ///< reported on the way
+  std::string error;  ///< the first that was reported; empty when none was
+};
 
-/// Prints the last line of JSON.
-void print_totals(bool ok, int errors, int warnings);
+/// Prints the netlist if it was found, or a line of JSON.
+void print_result(const settings& set, const resolution& of);
+
+/// Prints the last line of JSON, with the errors and warnings that were shown.
+void print_totals(bool ok);
 
 /// Counts what the names came to.
 class tally {
  public:
-  void add(short result, bool is_built);
+  void add(const resolution& next);
   /// Tells it, where there was more than one name. is_dry_run: nothing was started.
   void tell(std::size_t names, bool is_dry_run) const;
 

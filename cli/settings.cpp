@@ -11,11 +11,11 @@ namespace {
 constexpr option OPTIONS[] = {
     {"-p", "--part", "PART", "device part name",
      [](settings& to, const char* text) { to.part = text; }},
-    {"-sd", "--search-dir", "DIR", "search directory; may be repeated, searched in order",
+    {"-sd", "--search-dir", "DIR", "search directory; may be repeated, in order",
      [](settings& to, const char* text) { to.search_dirs.emplace_back(text); }},
     {"-l", "--library", "TEXT", "library entry; may be repeated",
      [](settings& to, const char* text) { to.libraries.push_back(text); }},
-    {"-o", "--output-dir", "DIR", "where netlisters write (default: the current directory)",
+    {"-o", "--output-dir", "DIR", "where netlisters write (default: here)",
      [](settings& to, const char* text) { to.output_dir = text; }},
     {"-u", "--user-rules", "FILE", "user rules file (extension urf by default)",
      [](settings& to, const char* text) { to.user_rules = text; }},
@@ -33,20 +33,19 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.aul = true; }},
     {nullptr, "--not-top", nullptr, "the netlists named are not top-level ones",
      [](settings& to, const char*) { to.top = false; }},
-    {nullptr, "--names-from", "FILE",
-     "read further names from FILE, one per line (\"-\": standard input)",
+    {nullptr, "--names-from", "FILE", "read more names from FILE (\"-\": standard input)",
      [](settings& to, const char* text) { to.names_files.push_back(text); }},
     {"-n", "--dry-run", nullptr, "announce the commands, start nothing",
      [](settings& to, const char*) { to.dry_run = true; }},
     {"-d", "--detail", nullptr, "say why, and from where",
      [](settings& to, const char*) { to.detail = true; }},
-    {"-e", "--explain", nullptr, "tell what would be done for each name, and why; start nothing",
+    {"-e", "--explain", nullptr, "tell what would be done, and why; start nothing",
      [](settings& to, const char*) { to.what = task::EXPLAIN; }},
     {nullptr, "--json", nullptr, "results as JSON, one object per line",
      [](settings& to, const char*) { to.json = true; }},
     {nullptr, "--check", nullptr, "load and check the rules, resolve nothing",
      [](settings& to, const char*) { to.what = task::CHECK; }},
-    {nullptr, "--list-rules", nullptr, "print the completed rules (with --detail: field by field)",
+    {nullptr, "--list-rules", nullptr, "print the completed rules (--detail: all fields)",
      [](settings& to, const char*) { to.what = task::LIST_RULES; }},
     {nullptr, "--graph", nullptr, "print the rules as a graph for Graphviz",
      [](settings& to, const char*) { to.what = task::GRAPH; }},
@@ -150,8 +149,8 @@ std::string read_command_line(int count, const char* const* words, settings& to)
 std::string help_text() {
   std::string text =
       "Usage: kestrel-launch [OPTION]... NAME...\n"
-      "Finds the file to read for each netlist NAME, and makes it where it is missing or out of\n"
-      "date. Prints its path.\n\n";
+      "Finds the file to read for each netlist NAME, and makes it where it is missing\n"
+      "or out of date. Prints its path.\n\n";
   for (const option& o : OPTIONS) {
     std::string line = "  ";
     line += o.short_name != nullptr ? std::string(o.short_name) + "," : "";
@@ -162,12 +161,10 @@ std::string help_text() {
     text += line + o.help + "\n";
   }
   text +=
-      "\nAn option of two letters or more has two dashes, but for -sd. Names after \"--\" may "
-      "begin\n"
-      "with \"-\".\n\n"
-      "Exit status: 0 every name was found; 1 at least one was not found; 2 an error was "
-      "reported,\n"
-      "the rules are not valid, or the command line is wrong.\n\n"
+      "\nAn option of two letters or more has two dashes, but for -sd. Names after \"--\"\n"
+      "may begin with \"-\".\n\n"
+      "Exit status: 0 every name was found; 1 at least one was not found; 2 an error\n"
+      "was reported, the rules are not valid, or the command line is wrong.\n\n"
       "Example: kestrel-launch -p hx1k-tq144 -sd src -o build blinky\n";
   return text;
 }
