@@ -1,10 +1,10 @@
 // Checking rules.
 #include <optional>
 #include <string>
-#include <unordered_set>
 #include <vector>
 
 #include "cli/console.h"
+#include "cli/finding_hints.h"
 #include "cli/hints.h"
 #include "cli/results.h"
 #include "cli/roots.h"
@@ -12,22 +12,22 @@
 #include "rules/baslarules.h"
 
 int check(const settings& set) {
-  std::vector<std::string> hints;
-  std::unordered_set<std::string> given;
+  finding_hints on_findings;
   std::optional<diversion> reading([&](const Port_Msg& message) {
-    const std::string hint = hint_on(message.text);
-    if (!hint.empty() && given.insert(hint).second) hints.push_back(hint);
+    on_findings.add(message.text);
     return false;
   });
   const LA_RULE_SET rules(set.part, set.user_rules);
   reading.reset();
   tell_if_empty(rules);
-  if (rules.is_valid) hints = hints_on(rules);
+  std::vector<std::string> hints = rules.is_valid ? hints_on(rules) : on_findings.all();
   for (std::string& hint : hints) hint.insert(0, "hint: ");
   complain(hints);
+  const bool good = rules.is_valid && (hints.empty() || !set.strict);
   if (set.json) print_totals(rules.is_valid);
   if (!set.json && rules.is_valid) {
-    console::print("Rules checked: " + std::to_string(rules.rules.count) + ", all good\n");
+    console::print("Rules checked: " + std::to_string(rules.rules.count) +
+                   (good ? ", all good\n" : "\n"));
   }
-  return rules.is_valid ? ALL_FOUND : FAILED;
+  return good ? ALL_FOUND : FAILED;
 }

@@ -1,4 +1,4 @@
-// Hints for those who write rules.
+// Hints for those who write rules: what is allowed in a set of rules, and yet hardly meant.
 #ifndef KESTREL_CLI_HINTS_H
 #define KESTREL_CLI_HINTS_H
 
@@ -7,10 +7,8 @@
 
 #include "rules/baslarules.h"
 
-/// What is allowed and yet hardly meant in a valid set of rules, in its order.
+/// The hints on a valid set, in its order, each with the rule that it is about. Takes time in
+/// proportion to the number of rules; each program is looked for once.
 std::vector<std::string> hints_on(const LA_RULE_SET& set);
-
-/// A hint on an error message, or an empty text: the nearest keyword for one that is unknown.
-std::string hint_on(const std::string& error);
 
 #endif

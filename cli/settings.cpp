@@ -45,6 +45,8 @@ constexpr option OPTIONS[] = {
      [](settings& to, const char*) { to.json = true; }},
     {nullptr, "--check", nullptr, "load and check the rules, resolve nothing",
      [](settings& to, const char*) { to.what = task::CHECK; }},
+    {nullptr, "--strict", nullptr, "with --check: a hint is a failure, too",
+     [](settings& to, const char*) { to.strict = true; }},
     {nullptr, "--list-rules", nullptr, "print the completed rules (--detail: all fields)",
      [](settings& to, const char*) { to.what = task::LIST_RULES; }},
     {nullptr, "--graph", nullptr, "print the rules as a graph for Graphviz",

@@ -44,6 +44,7 @@ struct settings {
   bool detail = false;
   bool json = false;
   bool debug = false;
+  bool strict = false;
 };
 
 /// One option. The table of them is the source of the parser, of the help and of the completions.

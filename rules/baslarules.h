@@ -145,6 +145,7 @@ class LA_RULE {
   /// Where the rule begins: the file, as LA_RULE_SET::files names it, and the line of its RuleName
   /// or of its record. No line for a rule that no loader made.
   LA_ORIGIN origin;
+  bool is_inherited_from = false;  ///< an earlier rule has taken something from it
 };
 
 using DARRAY_LA_RULE_PTR = UT_TYPED_DARRAY<LA_RULE*>;
