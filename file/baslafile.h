@@ -50,7 +50,7 @@ class LA_DIR {
   friend class LA_FULLFILE;
   friend class LA_FULLROOT;
   LA_DIR(la_text unc_host, la_text drive, la_text dir);
-  void append_to(la_path_text& text) const;
+  la_path_text full_name() const;
 
   la_text unc_host;
   la_text drive;
@@ -188,7 +188,7 @@ class LA_FULLFILE {
   bool has_dir() const { return dir && dir->dir != nullptr; }
   bool complete() const { return has_dir() && file && file->names_file(); }
   unsigned char set_part(la_text LA_FILE::*part, const char* text);
-  void append_full_name_to(la_path_text& text) const;
+  la_path_text full_name() const;
 
   std::unique_ptr<LA_DIR> dir;
   std::unique_ptr<LA_FILE> file;
