@@ -32,20 +32,20 @@ demo:
 	@$(MAKE) --no-print-directory build >/dev/null
 	@tools/demo $(BUILD)
 
-# The recipes of the cookbook, with the programs that they are about.
+# Runs the recipes of the cookbook, with the programs they are about.
 cookbook:
 	@tools/setup $(COOKBOOK_PACKAGES)
 	@$(MAKE) --no-print-directory build >/dev/null
 	@tools/cookbook $(BUILD) docs/cookbook.md
 
-# The guide for clusters, beside a Slurm of this machine.
+# Runs the guide for clusters, with a Slurm on this machine.
 cluster:
 	@tools/setup $(CLUSTER_PACKAGES)
 	@$(MAKE) --no-print-directory build >/dev/null
 	@tools/with-slurm sh -c 'echo "export SLURM_CONF=$$SLURM_CONF" >$(BUILD)/slurm.env && \
 	  tools/cookbook $(BUILD) docs/cluster.md --setup $(BUILD)/slurm.env'
 
-# The same tasks for the launcher, make and ninja: the table of docs/why-not-make.md.
+# Gives the launcher, make and ninja the same tasks: makes the table of docs/why-not-make.md.
 compare:
 	@tools/setup $(COMPARE_PACKAGES)
 	@$(MAKE) --no-print-directory build >/dev/null
@@ -58,14 +58,14 @@ test:
 	@cd $(BUILD) && ctest --output-on-failure --parallel $(JOBS)
 	@echo "All tests passed, of $(BUILD)/bin/kestrel-launch and its library."
 
-# Two to eight minutes, on a machine with nothing else to do.
+# Takes two to eight minutes; the machine should do nothing else.
 bench:
 	@tools/setup $(BENCH_PACKAGES)
 	@cmake -S . -B $(BUILD) -DCMAKE_BUILD_TYPE=Release -DKESTREL_TESTS=OFF -DKESTREL_BENCH=ON >/dev/null
 	@cmake --build $(BUILD) --parallel $(JOBS) --target bench
 	@bench/run --bin $(BUILD)/bin $(if $(QUICK),--quick) $(ROWS)
 
-# The tests again, under AddressSanitizer (with its leak check) and UndefinedBehaviorSanitizer.
+# Runs the tests under AddressSanitizer (with its leak check) and UndefinedBehaviorSanitizer.
 sanitize:
 	@tools/setup $(TEST_PACKAGES)
 	@cmake -S . -B $(BUILD)-sanitize -DCMAKE_BUILD_TYPE=Debug -DKESTREL_SANITIZE=ON >/dev/null
@@ -73,19 +73,19 @@ sanitize:
 	@cd $(BUILD)-sanitize && ctest --output-on-failure --parallel $(JOBS)
 	@echo "All tests passed under AddressSanitizer and UndefinedBehaviorSanitizer."
 
-# Looks for inputs for which something does not hold, for so many seconds in each target.
+# Looks for inputs that break something, for $(SECONDS) seconds in each target.
 fuzz:
 	@tools/setup $(FUZZ_PACKAGES)
 	@cmake --preset fuzz -B $(BUILD)-fuzz >/dev/null
 	@cmake --build $(BUILD)-fuzz --parallel $(JOBS) --target fuzz-targets
 	@tools/fuzz $(BUILD)-fuzz $(SECONDS)
 
-# The formatter and the linter, which must have nothing to say.
+# Runs the formatter and the linter; both must be silent.
 lint:
 	@tools/setup $(LINT_PACKAGES) $(TEST_PACKAGES)
 	@tools/lint $(BUILD)
 
-# Debian packages of the command, the library, and what programs that use it are built with.
+# Makes Debian packages: the command, the library, and its development files.
 package:
 	@tools/setup $(PACKAGE_PACKAGES)
 	@cmake -S . -B $(BUILD)-package -DCMAKE_BUILD_TYPE=Release -DCMAKE_INSTALL_PREFIX=/usr -DKESTREL_TESTS=OFF >/dev/null
@@ -99,10 +99,10 @@ help:
 	@echo "make           build the library and the command"
 	@echo "make demo      set up, build, and resolve the examples"
 	@echo "make cookbook  set up, build, and run the recipes of docs/cookbook.md"
-	@echo "make cluster   the same for docs/cluster.md, beside a Slurm of this machine"
+	@echo "make cluster   the same for docs/cluster.md, with a Slurm on this machine"
 	@echo "make compare   give the same tasks to the launcher, make and ninja"
 	@echo "make test      set up, build, and pass all tests"
-	@echo "make bench     measure the launcher beside make and ninja; ROWS=\"1 3\" QUICK=1"
+	@echo "make bench     compare its speed with make and ninja; ROWS=\"1 3\" QUICK=1"
 	@echo "make sanitize  pass all tests under the sanitizers"
 	@echo "make fuzz      look for inputs that break something, for SECONDS=$(SECONDS) in each target"
 	@echo "make lint      check format and code with clang's tools"
