@@ -1,6 +1,7 @@
 // Checking rules.
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "cli/console.h"
@@ -20,7 +21,10 @@ int check(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
   reading.reset();
   tell_if_empty(rules);
-  std::vector<std::string> hints = rules.is_valid ? hints_on(rules) : on_findings.all();
+  std::vector<std::string> hints = on_findings.all();
+  if (rules.is_valid) {
+    for (std::string& hint : hints_on(rules)) hints.push_back(std::move(hint));
+  }
   for (std::string& hint : hints) hint.insert(0, "hint: ");
   complain(hints);
   const bool good = rules.is_valid && (hints.empty() || !set.strict);

@@ -29,6 +29,10 @@ std::string exit_code(std::string_view /*unused*/, const line_of_rules& /*unused
   return "an exit code is a number, perhaps behind =, !, < or >: 0, !0, \"< 4\"";
 }
 
+std::string comma(std::string_view /*unused*/, const line_of_rules& /*unused*/) {
+  return "a comma ends a field: no option can hold one";
+}
+
 std::string comment(std::string_view /*unused*/, const line_of_rules& line) {
   return la_trimmed(line.text()).starts_with('#') ? "here comments begin with //" : "";
 }
@@ -93,6 +97,7 @@ constexpr struct {
     {": Unexpected key word ", "\n", rule_keyword},
     {"Undefined keyword \"", "\" in", option_keyword},
     {"Invalid exit code for ", ".\n", exit_code},
+    {" - Only the first ", " fields", comma},
 };
 
 }  // namespace

@@ -9,6 +9,7 @@
 #include <unordered_set>
 #include <utility>
 
+#include "cli/place.h"
 #include "cli/relations.h"
 #include "host/port_env.h"
 #include "host/port_process.h"
@@ -41,11 +42,32 @@ std::string on_netlister(const LA_RULE& rule) {
   return "its netlister " + words[0] + (is_path ? " cannot be started" : " is not on PATH");
 }
 
+/// Whether the rule is one of a data file, where a comma ends a field, whatever was meant.
+bool is_record(const LA_RULE& rule) {
+  return rule.origin.file.ends_with(".acd");
+}
+
+bool names_keyword(std::string text) {
+  UT_STR::Lower(text.data());
+  return std::any_of(LA_OPTION_KEYWORDS.begin(), LA_OPTION_KEYWORDS.end(), [&](std::string word) {
+    UT_STR::Lower(word.data());
+    return text.find("$" + word) != text.npos;
+  });
+}
+
 std::string on_directory(const LA_RULE& rule) {
   const char* directory = rule.netlister_dir ? rule.netlister_dir->get_dir() : nullptr;
   if (rule.netlister_dir_flag != DIR_GIVEN || directory == nullptr) return {};
-  if (Port::File::isdirectory(directory)) return {};
-  return std::string("its netlister directory ") + directory + " is not there";
+  const std::string name(directory);
+  if (is_record(rule) && names_keyword(name)) {
+    return "its netlister directory looks like the rest of its options: a comma ends a field";
+  }
+  if (const std::size_t at = name.find("/$"); at != name.npos) {
+    return "its netlister directory " + name.substr(at + 1, name.size() - at - 2) +
+           " is neither $SOURCE nor $OUTPUT, and taken as a name";
+  }
+  return Port::File::isdirectory(directory) ? ""
+                                            : "its netlister directory " + name + " is not there";
 }
 
 std::string on_relation(const LA_RULE& rule, const relation& to_others) {
@@ -75,6 +97,14 @@ std::string on_files(const LA_RULE& /*unused*/, const std::string& options) {
   if (!has_input && !has_output) return "name neither $infile nor $outfile";
   if (!has_input) return "do not name $infile";
   return has_output || names(text, "$output") ? "" : "do not name $outfile";
+}
+
+std::string on_quotes(const LA_RULE& rule, const std::string& options) {
+  std::vector<std::string> words;
+  if (options.find_first_of("\"'") == options.npos) return {};
+  if (Port_Process::Split(rule.netlister.get() + (" " + options), words)) return {};
+  return std::string("hold a quote without its partner") +
+         (is_record(rule) ? ": a comma ends a field" : "");
 }
 
 std::string on_shell_operators(const LA_RULE& /*unused*/, const std::string& options) {
@@ -119,16 +149,18 @@ std::string on_shell_text(const LA_RULE& rule, const std::string& options) {
 }
 
 constexpr std::string (*ON_TEMPLATES[])(const LA_RULE& rule, const std::string& options) = {
-    on_files, on_shell_operators, on_shell_text};
+    on_files, on_quotes, on_shell_operators, on_shell_text};
 
 }  // namespace
 
 std::vector<std::string> hints_on(const LA_RULE_SET& set) {
+  const place_names places;
   std::vector<std::string> hints;
   std::unordered_set<std::string> given;
   const auto give = [&](const LA_RULE& rule, const char* what, const std::string& hint) {
     if (hint.empty()) return;
-    std::string line = std::string("rule ") + rule.rule_name.get() + ": " + what + hint;
+    std::string line =
+        places.line(rule.origin) + ": rule " + rule.rule_name.get() + ": " + what + hint;
     if (given.insert(line).second) hints.push_back(std::move(line));
   };
   std::unordered_map<std::string_view, std::string> on_netlisters;

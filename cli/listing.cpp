@@ -4,11 +4,27 @@
 #include "cli/completion.h"
 #include "cli/console.h"
 #include "cli/graph.h"
+#include "cli/place.h"
 #include "cli/roots.h"
 #include "cli/settings.h"
 #include "cli/tasks.h"
 #include "host/pm_pic.h"
 #include "rules/baslarules.h"
+
+namespace {
+
+/// What the dump of a rule leaves out.
+std::string rest_of(const LA_RULE& rule, const place_names& places, bool detail) {
+  const std::string place = places.line(rule.origin);
+  if (!detail) return "    from " + place + "\n";
+  std::string files;
+  if (rule.has_dependency_files()) {
+    for (const LA_FILE* file : *rule.dependency_files) files.append(" ").append(file->get_file());
+  }
+  return "Dependency Files:" + files + "\nFrom: " + place + "\n";
+}
+
+}  // namespace
 
 int list_rules(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
@@ -18,8 +34,13 @@ int list_rules(const settings& set) {
     if (is_listed) console::print(message.text);
     return is_listed;
   });
-  if (rules.is_valid) rules.dump(set.detail);
-  return rules.is_valid ? ALL_FOUND : FAILED;
+  if (!rules.is_valid) return FAILED;
+  const place_names places;
+  for (const LA_RULE* rule : rules.rules) {
+    rule->dump(set.detail);
+    console::print(rest_of(*rule, places, set.detail));
+  }
+  return ALL_FOUND;
 }
 
 int draw_graph(const settings& set) {
