@@ -356,5 +356,6 @@ Port_Process::PROCESS_STATUS Port_Process::Run(const char* command) {
   const int error = reap(child, exit_code_);
   Port_Interrupt::child_reaped(child);
   if (error == 0) return PROCESS_ENDED;
-  return fail(words[0], std::string("its exit code could not be learnt: ") + std::strerror(error));
+  fail(words[0], std::string("its exit code could not be learnt: ") + std::strerror(error));
+  return PROCESS_LOST;
 }

@@ -17,7 +17,8 @@ class Port_Process {
   /// What Run returns.
   enum PROCESS_STATUS {
     PROCESS_ENDED = 0,   ///< the program was started and has ended
-    PROCESS_FAILED = 1,  ///< it could not be started, or its exit code could not be learnt
+    PROCESS_FAILED = 1,  ///< it could not be started
+    PROCESS_LOST = 2,    ///< it was started, but its exit code could not be learnt
   };
 
   /// mode 2: what the program writes to its standard output and error goes to Output, line by

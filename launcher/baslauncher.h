@@ -3,20 +3,16 @@
 #define KESTREL_LAUNCHER_BASLAUNCHER_H
 
 #include <memory>
-#include <string>
 #include <vector>
 
 #include "file/baslafile.h"
 #include "host/port_process.h"
-#include "host/ut_darray.h"
 #include "host/ut_str.h"
 #include "launcher/explanation.h"
 
-class LA_RULE;
 class LA_RULE_SET;
-class la_command_options;
-class la_rule_index;
-using DARRAY_LA_RULE_CONST_PTR = UT_TYPED_DARRAY<const LA_RULE*>;
+class la_lookup;
+struct la_plan;
 
 /// What find returns.
 enum : short { LA_FAILED = -1, LA_FOUND = 0, LA_NOT_FOUND = 1 };
@@ -74,18 +70,28 @@ class LA_LAUNCHER {
   /// to read may not exist; LA_DISABLE looks for the name in lower case in the search directories
   /// and does nothing else: no rules, no messages, and source_path stays empty.
   short find(const char* name, char* source_path, char* netlist_path, unsigned char top);
-  /// Whether the last find that returned LA_FOUND has seen the file to read. If not, a netlister
-  /// was to write it, whose exit code was good.
-  bool saw_netlist() const { return netlist_seen; }
   /// Appends search directories, to be searched after those that there are. A relative name is
   /// relative to the current directory of this moment. More than 32767 in all are refused, with an
   /// error message.
   void add_searchpaths(const char** searchpaths, short num_searchpaths);
+  /// Of the last find that returned LA_FOUND: whether it has seen the file to read. If not, a
+  /// netlister was to write it, whose exit code was good.
+  bool saw_netlist() const;
+  /// The netlisters that the last find has announced, in their order, and how they ended. Good
+  /// until the next find.
+  const std::vector<LA_RUN>& last_runs() const;
   /// From now on find adds what it sees and decides to this object, which stays the caller's; null
   /// ends that.
-  void explain_to(LA_EXPLANATION* to) { explanation = to; }
-  /// The rules, which live as long as the launcher.
-  const LA_RULE_SET& rule_set() const { return *rules; }
+  void explain_to(LA_EXPLANATION* to);
+  /// The rules, which live as long as the launcher; null if memory ran out in the constructor.
+  const LA_RULE_SET* rule_set() const { return rules.get(); }
+  /// From now on find asks, before it looks at the first step of a chain, whether the chain that
+  /// leads from source to netlist, both full names, may be carried out. When the answer is 0, which
+  /// the host has told its user the reason of, nothing is run, and find returns LA_FAILED. context
+  /// is handed on; null for may_build ends that. It must not call the launcher.
+  void ask_before_chains(unsigned char (*may_build)(void* context, const char* source,
+                                                    const char* netlist),
+                         void* context);
 
   /// 1 when the rules were loaded and passed their checks.
   unsigned char ok = 0;
@@ -101,57 +107,18 @@ class LA_LAUNCHER {
   int runs = 0;
 
  private:
+  struct la_finding;
+
   short find_disabled(const char* name, char* netlist_path);
   short find_enabled(const char* name, char* source_path, char* netlist_path, unsigned char top);
-  void find_home();
-  bool is_usable(const LA_FULLFILE& given, const char* name);
-  /// A file, and what was known of it when it was found.
-  struct found_file {
-    LA_FULLFILE file;
-    Port::FileStatus status;
-  };
-  struct lookup;
-  bool is_interrupted(const LA_FULLFILE& file);
-  void find_named(lookup& where);
-  short find_native(lookup& where, bool named_kbc, found_file& source, char* netlist_path);
-  const char* at_home(const char* path) const;
-  Port::FileStatus status_at_home(const char* path) const;
-  bool find_file(lookup& where, const char* ext, found_file& found);
-  void note(const char* path, LA_EXPLANATION::SIGHTING sighting) const;
-  unsigned char find_in_searchpaths(lookup& where, const char* ext, found_file& found);
-
-  short plan_chain(lookup& where, const char* wanted, unsigned char* visited, found_file& source,
-                   DARRAY_LA_RULE_CONST_PTR& chain);
-  void note(int rule, LA_EXPLANATION::VERDICT verdict) const;
-  void note_taken(int rule) const;
-  bool find_input(lookup& where, const LA_RULE& rule, found_file& source);
-  void report_loop(const unsigned char* visited);
-
-  struct build_step;
-  class working_directory;
-  struct shared_by_runs;
-  short build_chain(const found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
-                    unsigned char top, char* netlist_path);
-  LA_FULLFILE output_of(const LA_FULLFILE& source, const LA_RULE& rule) const;
-  LA_FULLFILE input_of(const build_step& step) const;
-  void set_options(la_command_options& options) const;
-  void decide(build_step& step) const;
-  LA_BUILD_DECISION decide_by_dependency_files(build_step& step) const;
-  void note(const build_step& step) const;
-  bool report_decision(const build_step& step);
-  bool run_netlister(const build_step& step, shared_by_runs& shared, unsigned char top);
-  void enter_directory(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
-                       working_directory& directory) const;
-  bool make_command(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
-                    la_command_options& options, unsigned char top, std::string& command);
-  bool execute(const LA_RULE& rule, const std::string& command);
-  void distrust(const char* output, const Port::FileStatus& before);
+  Port::FileStatus find_named(const LA_FULLFILE& given, la_lookup& where);
+  short carry_out(const la_plan& plan, unsigned char top, char* source_path, char* netlist_path);
 
   la_text part_name;
   std::unique_ptr<LA_DIR> output_dir;
-  short num_searchpaths;
+  short num_searchpaths = 0;
   std::unique_ptr<std::unique_ptr<LA_DIR>[]> searchpaths;
-  short num_libraries;
+  short num_libraries = 0;
   std::unique_ptr<la_text[]> libraries;
   unsigned char force;
   unsigned char ignore_timestamps;
@@ -160,18 +127,9 @@ class LA_LAUNCHER {
   la_text quiet;
   la_text aul;
   unsigned char named_found = 0;
-  bool netlist_seen = false;
-  found_file named_file;
-  /// Where this find looks for its name in the search directories; none before that is needed. Kept
-  /// for the sake of its memory.
-  std::vector<LA_FULLROOT> in_searchpaths;
-  LA_DIR home;  ///< the current directory when this find began
-  /// Its name, with "/" at its end; empty when it has none that leads to it.
-  std::string home_name;
-  int home_runs = 0;  ///< the runs before that was seen
+  LA_FULLFILE named_file;
   std::unique_ptr<LA_RULE_SET> rules;
-  std::unique_ptr<la_rule_index> index;  ///< the rules by their extensions
-  LA_EXPLANATION* explanation = nullptr;
+  std::unique_ptr<la_finding> finding;
 };
 
 #endif

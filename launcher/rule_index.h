@@ -8,6 +8,8 @@
 #include "host/text_numbers.h"
 #include "rules/baslarules.h"
 
+using DARRAY_LA_RULE_CONST_PTR = UT_TYPED_DARRAY<const LA_RULE*>;
+
 /// Knows which rules of a set produce files of an extension, whose letters' case does not count. As
 /// files are looked for as they are spelt, it numbers the spellings of the extensions, too. Rules
 /// are numbers in the order of the set, which must outlive this object.
@@ -16,7 +18,7 @@ class la_rule_index {
   static constexpr int NONE = la_hash_index::NONE;
 
   explicit la_rule_index(const DARRAY_LA_RULE_PTR& rules)
-      : rules_(static_cast<std::size_t>(rules.count)) {
+      : set_(rules), rules_(static_cast<std::size_t>(rules.count)) {
     add(nullptr);
     for (int i = rules.count - 1; i >= 0; --i) {
       const LA_RULE& rule = *rules.elements[i];
@@ -30,6 +32,9 @@ class la_rule_index {
     }
   }
 
+  /// The number of rules, and the rule of a number.
+  int count() const { return set_.count; }
+  const LA_RULE& operator[](int rule) const { return *set_.elements[rule]; }
   /// The first rule whose target has this extension, or NONE.
   int first_producer(const char* ext) const {
     const std::size_t extension = extensions_.find(ext);
@@ -61,6 +66,7 @@ class la_rule_index {
     return spelling;
   }
 
+  const DARRAY_LA_RULE_PTR& set_;
   std::vector<rule_entry> rules_;
   la_text_numbers<UT_STR::Compare> spellings_;
   la_text_numbers<UT_STR::ICompare> extensions_;

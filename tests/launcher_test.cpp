@@ -304,8 +304,8 @@ TEST(Plan, AsksForEachFileOnce) {
   for (const auto& row : table(R"(
 up     | 0 1 9 1   | the current directory 2, once; source 4, outputs 2, dependency 1
 up.sch | 0 1 7 1   | the same
-one    | 0 0 10 3  | sources 8, output 1, and 1 before it is made; names in the command 2
-two    | 0 0 9 5   | the current directory 2, after a run; source 4, output 1, and 2 before they are made; names in the commands 4
+one    | 0 0 15 3  | sources 8; output 1, and before and after its run; source and dependency likewise; names in the command 2
+two    | 0 0 17 5  | the current directory 2, after a run; source 4, output 1; before and after each run input and output, and the dependency of the second; names in the commands 4
 e      | 0 1 15 1  | the current directory 2, after a run; sources 8, .kbo 4, .kbc 1
 no     | 1 0 16 1  | sources 8, .kbo 4, .kbc 4
 no.edf | 1 0 20 1  | the name 4, and as before

@@ -1,0 +1,17 @@
+// The origin of the launcher's messages.
+#ifndef KESTREL_LAUNCHER_MESSAGE_H
+#define KESTREL_LAUNCHER_MESSAGE_H
+
+#include "host/port_msgman.h"
+
+/// The message manager, for one message from the line that calls this.
+Port_MsgManData& la_launcher_message(int line = __builtin_LINE());
+
+/// What every room of a find tells the user by, beside messages.
+struct la_report {
+  bool detail;  ///< detail messages are wanted
+  int& errors;
+  int& warnings;
+};
+
+#endif

@@ -1,0 +1,54 @@
+// Runs the netlisters of a chain, and sees to it that no file of theirs is taken for what it is
+// not.
+#ifndef KESTREL_LAUNCHER_NETLISTER_RUN_H
+#define KESTREL_LAUNCHER_NETLISTER_RUN_H
+
+#include "file/baslafile.h"
+#include "host/port_file.h"
+#include "launcher/build_settings.h"
+#include "launcher/command_options.h"
+#include "launcher/explanation.h"
+#include "launcher/home.h"
+#include "launcher/message.h"
+#include "launcher/working_directory.h"
+
+/// The files of a step.
+struct la_step_files {
+  const LA_FULLFILE& source;  ///< of the chain: dependency files lie beside it
+  const LA_FULLFILE& input;
+  const LA_FULLFILE& output;
+};
+
+/// The runs of one chain, which share a working directory and the values of keywords.
+class la_netlister_runs {
+ public:
+  /// All that it is given must outlive it. top asks for the options of the top level.
+  la_netlister_runs(const la_build_settings& settings, bool top, la_home& home,
+                    const la_report& report);
+
+  /// Announces and runs the rule's netlister, and judges how it ended; result gets what there is
+  /// to know of it, and its command is empty if nothing was announced. Returns false, after an
+  /// error message, when the chain ends here.
+  bool run(const LA_RULE& rule, const la_step_files& files, LA_RUN& result);
+  /// What is known of a file, wherever the process is.
+  Port::FileStatus ask(const char* path) const;
+  /// Sees to it that the output of a step that failed is never taken for up to date: gives it the
+  /// oldest time stamp that there is. Its content stays for whoever wants to look into it. before:
+  /// what was known of it before the run. Goes home for that.
+  void mark_stale(const la_step_files& files, const Port::FileStatus& before);
+
+ private:
+  bool execute(const LA_RULE& rule, LA_RUN& result) const;
+  void mind_changes(const std::vector<LA_EXPLANATION::SEEN>& before, const la_step_files& files,
+                    const LA_RUN& run) const;
+  std::vector<LA_EXPLANATION::SEEN> inputs_of(const LA_RULE& rule,
+                                              const la_step_files& files) const;
+
+  const bool top_;
+  la_home& home_;
+  const la_report& report_;
+  la_working_directory directory_;
+  la_command_options options_;
+};
+
+#endif
