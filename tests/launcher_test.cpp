@@ -136,8 +136,9 @@ struct World {
 void check(const std::string& rows) {
   std::string rules;
   for (const std::vector<std::string>& row : table(rows)) {
-    if (row.size() != 3) rules = row[0];
+    if (row.size() == 1 || row.size() == 4) rules = row[0];
     if (row.size() == 1) continue;
+    ASSERT_TRUE(row.size() == 3 || row.size() == 4) << "A cell is missing: " << row[0];
     World world(rules);
     const auto cell = row.end() - 3;
     world.tree.make(world.tree.expand(cell[0]));
