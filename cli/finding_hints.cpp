@@ -8,7 +8,7 @@
 #include "file/baslafile.h"
 #include "host/blanks.h"
 #include "launcher/command_options.h"
-#include "rules/baslarules.h"
+#include "rules/rule_fields.h"
 
 namespace {
 

@@ -3,7 +3,6 @@ include(CMakePackageConfigHelpers)
 
 set(KESTREL_HEADERS
   file/baslafile.h
-  host/arena.h
   host/port_file.h
   host/port_interrupt.h
   host/port_msgman.h
@@ -12,7 +11,10 @@ set(KESTREL_HEADERS
   host/ut_str.h
   launcher/baslauncher.h
   launcher/explanation.h
-  rules/baslarules.h)
+  rules/baslarules.h
+  rules/owning_array.h
+  rules/rule.h
+  rules/status.h)
 set(KESTREL_CMAKE_DIR ${CMAKE_INSTALL_LIBDIR}/cmake/KestrelLauncher)
 
 # The command, its data and its manual.

@@ -75,8 +75,8 @@ int Stream::readline(char* buffer, int size) {
   return length;
 }
 
-la_long_string Stream::readall() {
-  la_long_string text;
+std::string Stream::readall() {
+  std::string text;
   text.reserve(size_);
   for (; !geteof(); fill()) text.append(next_, end_);
   return text;

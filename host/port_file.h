@@ -6,7 +6,6 @@
 #include <memory>
 #include <string>
 
-#include "host/arena.h"
 #include "host/ut_str.h"
 
 #if !defined(_MSC_VER)
@@ -34,7 +33,7 @@ class Stream {
   /// line holds a zero byte.
   int readline(char* buffer, int size);
   /// All that has not been read yet.
-  la_long_string readall();
+  std::string readall();
   /// True once every line has been read, or reading failed.
   bool geteof() const { return next_ == end_; }
   /// True when the file could not be read to its end.

@@ -2,14 +2,12 @@
 #ifndef KESTREL_HOST_STATIC_ACD_H
 #define KESTREL_HOST_STATIC_ACD_H
 
-#include <cstddef>
 #include <deque>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 
-#include "host/arena.h"
 #include "host/blanks.h"
-#include "host/hash_index.h"
 #include "host/port_string.h"
 
 /// Reads one static data file. A line that begins with a blank continues the value above it, with
@@ -19,9 +17,9 @@
 class StaticAcdRead {
  public:
   struct entry {
-    std::string_view key;
-    std::string_view value;
-    int line;  ///< of the key, from 1
+    std::string key;
+    std::string value;
+    int line = 0;  ///< of the key, from 1
   };
 
   /// Reads the file at path; a missing one holds no keys. A file that cannot be read holds none
@@ -38,19 +36,17 @@ class StaticAcdRead {
   Port::StringBase<char> GetStringByKey(const char* key, const char* separator, short index,
                                         const char* separator2, short index2) const;
 
-  /// The same without copies, for who wants all of the fields: the value of key, null when it does
-  /// not exist, which is good as long as this object.
-  std::string_view value(std::string_view key) const;
-  /// The line where key stands, from 1; 0 when it does not exist.
-  int line(std::string_view key) const;
-  /// Takes the first field from the front of such a text, which is null after the last one.
+  /// The entry of key, which lives as long as this object; an empty one when there is none. For who
+  /// wants all fields of a value.
+  const entry& find(std::string_view key) const;
+  /// Takes the first field from the front of a value, which is null after the last one.
   static std::string_view take_piece(std::string_view& text, char separator) {
     const std::size_t end = text.find(separator);
     const std::string_view piece = la_trimmed(text.substr(0, end));
     text = end == text.npos ? std::string_view() : text.substr(end + 1);
     return piece;
   }
-  /// All keys and their values, in the order of the file; good as long as this object.
+  /// All entries, in the order of the file.
   const std::deque<entry>& entries() const { return entries_; }
   /// False when something of the file could not be read or understood.
   bool valid() const { return valid_; }
@@ -58,18 +54,11 @@ class StaticAcdRead {
  private:
   /// False when the line is not of the form above; it is then passed over.
   bool read_line(std::string_view line, int number);
-  const entry* find(std::string_view key) const;
-  auto is_key(std::string_view key) const {
-    return [this, key](int number) { return la_at(entries_, number).key == key; };
-  }
-  std::string_view joined(std::string_view value, std::string_view content);
 
-  la_long_string text_;  ///< the file, with the lines of a value joined where the first stands
-  std::deque<entry> entries_;  ///< stay where they are: last_value_ points into them
-  la_hash_index index_;        ///< of the entries, by key
-  mutable std::size_t last_found_ = 0;
-  std::string_view* last_value_ = nullptr;
-  std::string_view passed_over_;  ///< the value of a key that stands earlier too
+  std::deque<entry> entries_;  ///< a deque: the keys in the index stay where they are
+  std::unordered_map<std::string_view, const entry*> index_;
+  std::string passed_over_;            ///< the value of a key that stands earlier too
+  std::string* last_value_ = nullptr;  ///< the one that a line with a blank at its start continues
   bool valid_ = true;
 };
 

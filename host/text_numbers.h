@@ -2,39 +2,50 @@
 #ifndef KESTREL_HOST_TEXT_NUMBERS_H
 #define KESTREL_HOST_TEXT_NUMBERS_H
 
-#include <vector>
+#include <cstddef>
+#include <functional>
+#include <string>
+#include <unordered_map>
 
-#include "host/hash_index.h"
+#include "host/ut_str.h"
+
+/// The element of this number.
+template <class Table>
+auto& la_at(Table& table, int number) {
+  return table[static_cast<std::size_t>(number)];
+}
 
 /// Numbers texts from 0 on, in the order in which they come. Those for which compare gives 0 have
-/// the same number; an absent text is an empty one. The texts must outlive this object.
+/// the same number; it may ignore the case of letters, nothing else. An absent text is an empty
+/// one. The texts must outlive this object.
 template <int (*compare)(const char*, const char*)>
 class la_text_numbers {
  public:
   /// The number of text, which is added if it is new.
   std::size_t number_of(const char* text) {
-    if (text == nullptr) text = "";
-    int& number = index_.place(la_hash(text), is_text(text));
-    if (number == la_hash_index::NONE) {
-      number = static_cast<int>(count());
-      texts_.push_back(text);
-    }
-    return static_cast<std::size_t>(number);
+    return numbers_.try_emplace(present(text), count()).first->second;
   }
   /// The number of text; count() when it has none.
   std::size_t find(const char* text) const {
-    const int number = index_.find(la_hash(text), is_text(text));
-    return number != la_hash_index::NONE ? static_cast<std::size_t>(number) : count();
+    const auto found = numbers_.find(present(text));
+    return found != numbers_.end() ? found->second : count();
   }
-  std::size_t count() const { return texts_.size(); }
+  std::size_t count() const { return numbers_.size(); }
 
  private:
-  auto is_text(const char* text) const {
-    return [this, text](int number) { return compare(la_at(texts_, number), text) == 0; };
-  }
+  struct hash {
+    std::size_t operator()(std::string text) const {
+      UT_STR::Lower(text.data());
+      return std::hash<std::string>()(text);
+    }
+  };
+  struct are_equal {
+    bool operator()(const char* a, const char* b) const { return compare(a, b) == 0; }
+  };
 
-  std::vector<const char*> texts_;
-  la_hash_index index_;
+  static const char* present(const char* text) { return text != nullptr ? text : ""; }
+
+  std::unordered_map<const char*, std::size_t, hash, are_equal> numbers_;
 };
 
 #endif

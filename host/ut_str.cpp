@@ -4,7 +4,6 @@
 #include <cstring>
 #include <string_view>
 
-#include "host/arena.h"
 #include "host/blanks.h"
 
 namespace {
@@ -116,19 +115,7 @@ void UT_STR::Lower(char* s) {
   for (; *s != '\0'; ++s) *s = static_cast<char>(lower(*s));
 }
 
-la_text::la_text(const char* chars, std::size_t length, la_arena* arena) {
-  if (chars == nullptr) {
-    room_[LAST] = ABSENT;
-    return;
-  }
-  char* to = room_;
-  if (length < SIZE) {
-    room_[LAST] = IN_PLACE;
-  } else {
-    to = arena != nullptr ? static_cast<char*>(arena->take(length + 1, 1)) : new char[length + 1];
-    std::memcpy(room_, &to, sizeof to);
-    room_[LAST] = arena != nullptr ? IN_ARENA : ELSEWHERE;
-  }
-  std::memcpy(to, chars, length);
-  to[length] = '\0';
+la_text::la_text(const char* chars, std::size_t length) : chars_(new char[length + 1]) {
+  std::memcpy(chars_.get(), chars, length);
+  chars_[length] = '\0';
 }

@@ -5,8 +5,7 @@
 
 #include <cstddef>
 #include <cstring>
-
-class la_arena;
+#include <memory>
 
 /// Length, terminator included, of every fixed path buffer.
 constexpr int LA_MAX_PATH = 260;
@@ -58,61 +57,25 @@ class UT_STR {
   static int IsAlpha(int c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
 };
 
-/// A string of its own, or none. Copies are deep. Short strings are kept in place: a move moves
-/// them.
+/// A string of its own, or none: an absent text and an empty one are two things. Copies are deep.
 class la_text {
  public:
-  la_text() noexcept { room_[LAST] = ABSENT; }
+  la_text() = default;
   /// A copy of chars; null makes an absent text.
-  la_text(const char* chars) : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0) {}
-  /// A copy of so many of chars; null makes an absent text.
-  la_text(const char* chars, std::size_t length) : la_text(chars, length, nullptr) {}
-  /// A copy of chars that the arena holds when it is long. Neither this text nor one that it is
-  /// moved to may be read after the end of the arena; a copy may. Null makes an absent text.
-  la_text(const char* chars, la_arena& arena)
-      : la_text(chars, chars != nullptr ? UT_STR::Len(chars) : 0, &arena) {}
+  la_text(const char* chars) : chars_(chars != nullptr ? UT_STR::Dup(chars) : nullptr) {}
+  /// A copy of the first length characters of chars, which hold no terminator.
+  la_text(const char* chars, std::size_t length);
   la_text(const la_text& other) : la_text(other.get()) {}
-  la_text(la_text&& other) noexcept { take(other); }
+  la_text(la_text&& other) noexcept = default;
   la_text& operator=(const la_text& other) { return *this = la_text(other); }
-  la_text& operator=(la_text&& other) noexcept {
-    if (this != &other) {
-      release();
-      take(other);
-    }
-    return *this;
-  }
-  ~la_text() { release(); }
+  la_text& operator=(la_text&& other) noexcept = default;
 
-  /// The characters, or null for an absent text; good until the text is changed, moved or
-  /// destroyed.
-  const char* get() const noexcept {
-    return room_[LAST] == IN_PLACE ? room_ : room_[LAST] == ABSENT ? nullptr : elsewhere();
-  }
+  /// The characters, or null for an absent text; good until the text is changed or destroyed.
+  const char* get() const noexcept { return chars_.get(); }
   operator const char*() const noexcept { return get(); }
 
  private:
-  /// What the last character of the room says; that of a string that fills it is its terminator.
-  enum : char { IN_PLACE = 0, ABSENT = 1, ELSEWHERE = 2, IN_ARENA = 3 };
-  static constexpr std::size_t SIZE = 16;
-  static constexpr std::size_t LAST = SIZE - 1;
-
-  la_text(const char* chars, std::size_t length, la_arena* arena);
-
-  char* elsewhere() const noexcept {
-    char* chars;
-    std::memcpy(&chars, room_, sizeof chars);
-    return chars;
-  }
-  void release() noexcept {
-    if (room_[LAST] == ELSEWHERE) delete[] elsewhere();
-  }
-  void take(la_text& other) noexcept {
-    std::memcpy(room_, other.room_, SIZE);
-    other.room_[LAST] = ABSENT;
-  }
-
-  /// The string, or a pointer to it.
-  alignas(char*) char room_[SIZE];
+  std::unique_ptr<char[]> chars_;
 };
 
 #endif

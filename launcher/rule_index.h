@@ -15,7 +15,7 @@ using DARRAY_LA_RULE_CONST_PTR = UT_TYPED_DARRAY<const LA_RULE*>;
 /// are numbers in the order of the set, which must outlive this object.
 class la_rule_index {
  public:
-  static constexpr int NONE = la_hash_index::NONE;
+  static constexpr int NONE = -1;
 
   explicit la_rule_index(const DARRAY_LA_RULE_PTR& rules)
       : set_(rules), rules_(static_cast<std::size_t>(rules.count)) {

@@ -2,7 +2,7 @@
 #ifndef KESTREL_RULES_INHERITANCE_H
 #define KESTREL_RULES_INHERITANCE_H
 
-#include "rules/baslarules.h"
+#include "rules/rule.h"
 
 /// Completes every rule from the later ones for the same pair of extensions: each field that it
 /// leaves open comes from the nearest of them that has it; status entries of a level that it

@@ -2,6 +2,10 @@
 #ifndef KESTREL_RULES_STATEMENT_READER_H
 #define KESTREL_RULES_STATEMENT_READER_H
 
+#include <optional>
+#include <string>
+#include <string_view>
+
 #include "host/port_file.h"
 #include "host/ut_str.h"
 
@@ -34,36 +38,36 @@ class la_statement_reader {
   /// The next statement or finding; END after the last one.
   item_kind next();
   /// Keyword and value of the statement that next() gave, until the next call.
-  const char* keyword() const { return keyword_; }
-  const char* value() const { return value_; }
+  const char* keyword() const { return keyword_.c_str(); }
+  const char* value() const { return value_.c_str(); }
   /// The line that was read last, from 1.
   int line() const { return line_number_; }
   /// The line where the last statement began, whether it is complete, unfinished or being dropped.
   int statement_line() const { return statement_line_; }
 
  private:
-  enum state { KEYWORD, EQUALS, VALUE, QUOTED, SEMICOLON, SKIP };
-  /// What step() and read_line() return when there is nothing to tell.
-  static constexpr item_kind NOTHING = END;
+  /// What comes next: a keyword, "=", a value, the rest of a value in quotes, of one in quotes that
+  /// is too long, ";", what is dropped up to ";".
+  enum state { KEYWORD, EQUALS, VALUE, QUOTED, TOO_LONG, SEMICOLON, SKIP };
+  using maybe_item = std::optional<item_kind>;
 
-  item_kind read_line();
+  maybe_item read_line();
   item_kind end_of_file();
-  item_kind step();
-  item_kind go(state next_state, item_kind result = NOTHING);
-  item_kind step_value();
-  item_kind step_quoted();
-  item_kind append_to_value(const char* text);
+  maybe_item step();
+  maybe_item step_keyword();
+  maybe_item step_value();
+  maybe_item step_quoted();
+  maybe_item go(state next_state, maybe_item result = {});
 
   Port::Stream& stream_;
   state state_ = KEYWORD;
+  bool ended_ = false;
   int line_number_ = 0;
   int statement_line_ = 0;
-  bool value_refused_ = false;
-  bool ended_ = false;
   char line_[LA_MAX_PATH] = "";
-  char* rest_ = line_;  ///< what has not been taken of the line
-  char keyword_[LA_MAX_PATH] = "";
-  char value_[LA_MAX_PATH] = "";
+  std::string_view rest_;  ///< what has not been taken of the line
+  std::string keyword_;
+  std::string value_;
 };
 
 #endif

@@ -9,7 +9,7 @@
 #include "cli/settings.h"
 #include "launcher/command_options.h"
 #include "optparse/baslaoptparse.h"
-#include "rules/baslarules.h"
+#include "rules/rule_fields.h"
 #include "support.h"
 
 namespace {

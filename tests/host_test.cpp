@@ -35,22 +35,6 @@ TEST_F(Host, StringsAndArrays) {
   EXPECT_TRUE(*static_cast<char**>(array.getaddr(9)) == nullptr && array.elements[0] == nullptr);
 }
 
-TEST_F(Host, PiecesOfAnArenaAreAlignedAndApart) {
-  la_arena memory;
-  std::vector<std::pair<char*, std::size_t>> pieces;
-  for (std::size_t i = 0; i < 9'000; ++i) {
-    const std::size_t size = 1 + (i % 3'000 == 0 ? 100'000 + i * 300 : i % 1'000);
-    const std::size_t alignment = std::size_t{1} << i % 5;
-    pieces.emplace_back(static_cast<char*>(memory.take(size, alignment)), size);
-    EXPECT_EQ(reinterpret_cast<std::uintptr_t>(pieces.back().first) % alignment, 0U) << i;
-    std::memset(pieces.back().first, static_cast<int>(i), size);
-  }
-  for (std::size_t i = 0; i < pieces.size(); ++i) {
-    const auto [piece, size] = pieces[i];
-    EXPECT_EQ(std::count(piece, piece + size, static_cast<char>(i)), size) << i;
-  }
-}
-
 // A cell is delimiters, then a line; the result is token, delimiter and rest, between "/".
 TEST_F(Host, Tokens) {
   const auto token_of = [](const std::string& cell) {
