@@ -40,9 +40,10 @@ bool is_written(const resolution& found) {
 /// A name as it is seen from everywhere. Without rules, the library leaves relative ones as they
 /// are.
 std::string full_name(const char* path) {
+  if (*path == '/' || *path == '\0') return path;
   std::error_code failure;
   const std::filesystem::path full = std::filesystem::absolute(path, failure);
-  return failure || *path == '\0' ? path : full.string();
+  return failure ? path : full.string();
 }
 
 /// Resolves one name.

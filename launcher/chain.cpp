@@ -22,8 +22,7 @@ class chain_build {
         home_(home),
         report_(report),
         why_(why),
-        tail_(source.file.get_tail()),
-        outputs_(settings.output_dir, tail_.get_root()),
+        outputs_(settings.output_dir, source.file.get_name()),
         input_status_(source.status) {}
 
   /// The full name of what a rule makes, good until the next call; null when there is none.
@@ -82,9 +81,8 @@ class chain_build {
     return rule_before != nullptr ? file_made_by(*rule_before) : source_;
   }
   /// Name and extension of what the step makes.
-  const char* output_tail() {
-    tail_.set_ext(rule_->target->get_ext());
-    return tail_.get_tail();
+  std::string output_tail() const {
+    return std::string(source_.get_name()) + "." + rule_->target->get_ext();
   }
 
   /// Reports the decision. Returns false when it ends the chain.
@@ -92,7 +90,7 @@ class chain_build {
     if (decision.what == LA_BUILD_UNSUPPORTED) {
       la_launcher_message().issueError(
           "Launcher: Netlist format of %s is no longer supported, could not create %s\n",
-          input(rule_before).get_fullfile(), output_tail());
+          input(rule_before).get_fullfile(), output_tail().c_str());
       ++report_.errors;
       return false;
     }
@@ -102,7 +100,7 @@ class chain_build {
     const bool is_gone =
         report_.detail && decision.what == LA_BUILD_AFTER_REBUILD && !ask(output_).exists;
     const char* text = report_on(is_gone ? LA_BUILD_MISSING : decision.what, report_.detail);
-    if (text != nullptr) la_launcher_message().issueStatus(text, output_tail());
+    if (text != nullptr) la_launcher_message().issueStatus(text, output_tail().c_str());
     return true;
   }
 
@@ -153,7 +151,6 @@ class chain_build {
   la_home& home_;
   const la_report& report_;
   LA_EXPLANATION* const why_;
-  LA_FILE tail_;         ///< of the source, with the extension of what was named last
   LA_FULLROOT outputs_;  ///< the outputs without their extensions
 
   // Of the step that is being carried out.
