@@ -26,7 +26,7 @@ constexpr const la_program& CHECKER = LA_RULE::CHECKER;
 constexpr la_rule_field FIELDS[] = {
     {"NetlistFile", text<&LA_RULE::set_netlist_file>, 594, true},
     {"TargetExtension", text<&LA_RULE::set_target>, 605, true},
-    {"dependency files", nullptr},
+    {"", nullptr},  // The dependency files.
     {"Netlister", text<&LA_RULE::set_netlister>, 632, true},
     {"NetlisterTopOptions", text<&LA_RULE::set_netlister_top_options>},
     {"NetlisterOptions", text<&LA_RULE::set_netlister_options>},

@@ -2,6 +2,7 @@
 // the man pages name the options and the keywords that there are.
 #include <gtest/gtest.h>
 
+#include <filesystem>
 #include <regex>
 #include <sstream>
 #include <utility>
@@ -94,6 +95,35 @@ TEST(Docs, ManPageNamesTheOptionsThatThereAre) {
   const std::regex long_name("--[a-z-]+");
   for (std::sregex_iterator at(page.begin(), page.end(), long_name), end; at != end; ++at) {
     EXPECT_NE(help.find(at->str() + " "), help.npos) << at->str();
+  }
+}
+
+/// The longest run of words in the literals of C++ code; empty when none has two words.
+std::string longest_clause(const std::string& literals) {
+  static const std::regex END(R"re("\s+"|%[a-z]|\\.|[^-A-Za-z' ]|\B[-' ]|[-' ]\B)re");
+  const std::string joined = std::regex_replace(literals, std::regex("\"\\s+\""), "");
+  std::string longest;
+  for (std::sregex_token_iterator at(joined.begin(), joined.end(), END, -1), end; at != end; ++at) {
+    if (at->length() > static_cast<int>(longest.size())) longest = *at;
+  }
+  return longest.find(' ') != longest.npos ? longest : "";
+}
+
+TEST(Docs, GuideHasARowForEveryMessage) {
+  std::string rows = guide("rules.md");
+  rows.erase(0, rows.find("\n## Messages\n"));
+  // A comment, a character, or literals perhaps behind the name of a function.
+  const std::regex token(R"re(//.*|'\\?.'|(\w*\()?((?:"(?:[^"\\]|\\.)*"\s*)+))re");
+  for (const char* folder : {"file", "host", "launcher", "optparse", "rules"}) {
+    const std::filesystem::directory_iterator files(KESTREL_SOURCE_DIR "/" + std::string(folder));
+    for (const auto& file : files) {
+      const std::string code = slurp(file.path());
+      for (std::sregex_iterator at(code.begin(), code.end(), token), end; at != end; ++at) {
+        const std::string literals = at->str(2);
+        if (at->str(1) == "issueStatus(" && literals.find("Launcher") != 1) continue;  // A dump.
+        EXPECT_NE(rows.find(longest_clause(literals)), rows.npos) << literals;
+      }
+    }
   }
 }
 
