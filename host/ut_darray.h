@@ -1,10 +1,10 @@
-// Growable arrays of pointers.
+// Growable arrays of pointers: sorting and searching, storage, and a typed array over both.
 #ifndef KESTREL_HOST_UT_DARRAY_H
 #define KESTREL_HOST_UT_DARRAY_H
 
 #include <cstddef>
 #include <cstdint>
-#include <memory>
+#include <vector>
 
 /// Sorting and searching over the elements of an array. Elements are compared by the addresses of
 /// the places that hold them.
@@ -42,7 +42,7 @@ class UT_DARRAY : public UT_BASE_ARRAY {
  protected:
   /// elements: address of the pointer to the storage, which this class keeps up to date and which
   /// starts as null. element_size: the size of a pointer. step: how many elements the first
-  /// storage holds; from then on it doubles. flag: not used.
+  /// storage holds; it then doubles. flag: not used.
   UT_DARRAY(void** elements, int element_size, int step, unsigned char flag);
 
   void clearmem(void* from, int count) override;
@@ -55,8 +55,6 @@ class UT_DARRAY : public UT_BASE_ARRAY {
   virtual void a_resetnum(int count);
   /// Index of the first element that is this pointer, or -1.
   virtual int intgetindex(void* element);
-  /// Whether another element fits in the storage as it is.
-  bool has_room() const { return static_cast<std::uint64_t>(count) < capacity_; }
   /// A copy of the storage, made with array new; the caller releases it.
   virtual void* a_makearray();
 
@@ -70,14 +68,14 @@ class UT_DARRAY : public UT_BASE_ARRAY {
   virtual void reserve(std::uint64_t size);
 
  private:
-  std::size_t bytes(int elements) const;
-  void* place(int index) const { return storage_.get() + bytes(index); }
+  std::ptrdiff_t bytes(int elements) const;
+  void* place(int index) { return storage_.data() + bytes(index); }
+  void publish();
 
   void* const elements_;
   const int element_size_;
   const int step_;
-  std::unique_ptr<char[]> storage_;
-  std::uint64_t capacity_ = 0;
+  std::vector<char> storage_;  ///< of the elements in use
 };
 
 /// A UT_DARRAY whose elements, pointers of the type Element, are read directly.
@@ -91,13 +89,7 @@ class UT_TYPED_DARRAY : public UT_DARRAY {
   using UT_DARRAY::a_resetnum;
 
   /// Adds an element at the end.
-  void append(Element element) {
-    if (has_room()) {
-      elements[count++] = element;
-    } else {
-      *static_cast<Element*>(getaddr(count)) = element;
-    }
-  }
+  void append(Element element) { *static_cast<Element*>(getaddr(count)) = element; }
   /// The elements in use, for a loop; good until the array grows.
   Element* begin() const { return elements; }
   Element* end() const { return elements + count; }
