@@ -194,25 +194,4 @@ class LA_FULLFILE {
   std::unique_ptr<LA_FILE> file;
 };
 
-/// The full names of files that differ in their extensions only, ready but for these: for when many
-/// of them are asked for.
-class LA_FULLROOT {
- public:
-  /// Of the files with this head and name (LA_FILE::get_root) in the directory.
-  LA_FULLROOT(const LA_DIR& directory, const char* root);
-  /// Of the files that differ from this one, which has a name and is complete.
-  explicit LA_FULLROOT(const LA_FULLFILE& file);
-
-  /// LA_FULLFILE::get_fullfile of the file with this extension, which has no "/"; null for none.
-  /// Good until the next call.
-  const char* with_ext(const char* ext);
-
- private:
-  char chars[LA_MAX_PATH];
-  std::size_t length = 0;
-  /// For dot, extension and terminator: less than chars has left where the name was brought into
-  /// its normal form.
-  std::size_t room = 0;
-};
-
 #endif

@@ -1,8 +1,6 @@
-#include <cstring>
+#include "file/full_root.h"
 
-#include "file/baslafile.h"
 #include "file/normal_form.h"
-#include "file/path_text.h"
 #include "host/ut_path.h"
 
 LA_FULLROOT::LA_FULLROOT(const LA_DIR& directory, const char* root) {
@@ -10,21 +8,18 @@ LA_FULLROOT::LA_FULLROOT(const LA_DIR& directory, const char* root) {
   la_path_text text = directory.full_name();
   text.add(root);
   if (!text.fits()) return;
-  room = LA_MAX_PATH - text.length();
+  room_ = LA_MAX_PATH - text.length();
   la_normalise(text);
-  length = text.length();
-  std::memcpy(chars, text.chars(), length);
+  length_ = text.length();
+  text_ = text;
 }
 
 LA_FULLROOT::LA_FULLROOT(const LA_FULLFILE& file) : LA_FULLROOT(*file.dir, file.get_root()) {}
 
 const char* LA_FULLROOT::with_ext(const char* ext) {
-  const std::size_t added = ext != nullptr ? 1 + std::strlen(ext) : 0;
-  if (added >= room) return nullptr;
-  if (ext != nullptr) {
-    chars[length] = '.';
-    std::memcpy(chars + length + 1, ext, added - 1);
-  }
-  chars[length + added] = '\0';
-  return UT_PATH::ExternalPath(chars);
+  const std::size_t added = ext != nullptr ? 1 + UT_STR::Len(ext) : 0;
+  if (added >= room_) return nullptr;
+  text_.cut(length_);
+  if (ext != nullptr) text_.add(".").add(ext);
+  return UT_PATH::ExternalPath(text_.chars());
 }

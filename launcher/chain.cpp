@@ -4,6 +4,7 @@
 #include <optional>
 #include <utility>
 
+#include "file/full_root.h"
 #include "host/port_interrupt.h"
 #include "launcher/decision.h"
 #include "launcher/netlister_run.h"

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "file/baslafile.h"
+#include "file/full_root.h"
 #include "host/port_file.h"
 #include "launcher/explanation.h"
 #include "launcher/home.h"
