@@ -58,16 +58,16 @@ bool names_keyword(std::string text) {
 std::string on_directory(const LA_RULE& rule) {
   const char* directory = rule.netlister_dir ? rule.netlister_dir->get_dir() : nullptr;
   if (rule.netlister_dir_flag != DIR_GIVEN || directory == nullptr) return {};
-  const std::string name(directory);
-  if (is_record(rule) && names_keyword(name)) {
+  const std::string text = rule.netlister_dir_text.get();
+  if (is_record(rule) && names_keyword(text)) {
     return "its netlister directory looks like the rest of its options: a comma ends a field";
   }
-  if (const std::size_t at = name.find("/$"); at != name.npos) {
-    return "its netlister directory " + name.substr(at + 1, name.size() - at - 2) +
-           " is neither $SOURCE nor $OUTPUT, and taken as a name";
-  }
-  return Port::File::isdirectory(directory) ? ""
-                                            : "its netlister directory " + name + " is not there";
+  const std::string start = "its netlister directory \"" + text + "\" ";
+  if (text.starts_with('$')) return start + "is neither $SOURCE nor $OUTPUT, and taken as a name";
+  const bool is_full = text.starts_with('/') || text.starts_with('\\') || text[1] == ':';
+  const std::string counts = "counts from the directory of the call";
+  if (Port::File::isdirectory(directory)) return is_full ? "" : start + counts;
+  return start + "is not there" + (is_full ? "" : "; it " + counts);
 }
 
 std::string on_relation(const LA_RULE& rule, const relation& to_others) {

@@ -39,6 +39,7 @@ bool complete(LA_RULE& rule, const LA_RULE& from) {
   for (const la_program* program : PROGRAMS) {
     if (rule.*program->dir_flag == DIR_UNSET && from.*program->dir_flag != DIR_UNSET) {
       rule.set_dir(*program, (from.*program->dir).get(), from.*program->dir_flag);
+      rule.*program->dir_text = from.*program->dir_text;
       has_taken = true;
     }
     if (complete_statuses(rule, from, *program)) has_taken = true;

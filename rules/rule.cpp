@@ -69,6 +69,7 @@ void LA_RULE::set_dir(const la_program& of, const char* text) {
   }
   const LA_DIR dir(text);
   set_dir(of, &dir, DIR_GIVEN);
+  this->*of.dir_text = text;
 }
 
 void LA_RULE::add_status(const la_program& of, const LA_STATUS& entry) {

@@ -36,6 +36,7 @@ struct la_program {
   la_text LA_RULE::*options;
   unsigned short LA_RULE::*dir_flag;
   std::unique_ptr<LA_DIR> LA_RULE::*dir;
+  la_text LA_RULE::*dir_text;
   DARRAY_LA_STATUS_PTR LA_RULE::*status;
 };
 
@@ -110,10 +111,12 @@ class LA_RULE {
   la_text netlister_options;
   unsigned short netlister_dir_flag = DIR_UNSET;
   std::unique_ptr<LA_DIR> netlister_dir;
+  la_text netlister_dir_text;  ///< as it was given, for people
   la_text checker;
   la_text checker_options;
   unsigned short checker_dir_flag = DIR_UNSET;
   std::unique_ptr<LA_DIR> checker_dir;
+  la_text checker_dir_text;
   DARRAY_LA_STATUS_PTR netlister_status{3};
   DARRAY_LA_STATUS_PTR checker_status{3};
   /// Where the rule begins: the file, as LA_RULE_SET::files names it, and the line of its RuleName
@@ -123,10 +126,10 @@ class LA_RULE {
 };
 
 inline constexpr la_program LA_RULE::NETLISTER = {
-    &LA_RULE::netlister, &LA_RULE::netlister_options, &LA_RULE::netlister_dir_flag,
-    &LA_RULE::netlister_dir, &LA_RULE::netlister_status};
-inline constexpr la_program LA_RULE::CHECKER = {&LA_RULE::checker, &LA_RULE::checker_options,
-                                                &LA_RULE::checker_dir_flag, &LA_RULE::checker_dir,
-                                                &LA_RULE::checker_status};
+    &LA_RULE::netlister,     &LA_RULE::netlister_options,  &LA_RULE::netlister_dir_flag,
+    &LA_RULE::netlister_dir, &LA_RULE::netlister_dir_text, &LA_RULE::netlister_status};
+inline constexpr la_program LA_RULE::CHECKER = {
+    &LA_RULE::checker,     &LA_RULE::checker_options,  &LA_RULE::checker_dir_flag,
+    &LA_RULE::checker_dir, &LA_RULE::checker_dir_text, &LA_RULE::checker_status};
 
 #endif
