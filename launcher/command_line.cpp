@@ -38,9 +38,9 @@ void set_keywords(la_command_options& options, const la_build_settings& settings
   options.set_keyword("quiet", settings.quiet);
   options.set_keyword("aul", settings.aul);
   const char* directory = settings.output_dir.get_dir();
-  options.set_name("OUTPUT", directory != nullptr ? directory : "");
+  options.set_keyword("OUTPUT", directory != nullptr ? directory : "");
   if (settings.libraries.empty()) options.set_keyword("libraries", nullptr);
-  for (const la_text& library : settings.libraries) options.add_name("libraries", library.get());
+  for (const la_text& library : settings.libraries) options.add_keyword("libraries", library.get());
 }
 
 std::string make_command(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
@@ -53,8 +53,8 @@ std::string make_command(const LA_RULE& rule, const LA_FULLFILE& input, const LA
     ++report.errors;
     return {};
   }
-  options.set_name("infile", infile);
-  options.set_name("outfile", outfile);
+  options.set_file("infile", infile);
+  options.set_file("outfile", outfile);
 
   const char* options_template = template_of(rule, top);
   char expanded[LA_MAX_OPTIONS];
@@ -65,11 +65,20 @@ std::string make_command(const LA_RULE& rule, const LA_FULLFILE& input, const LA
   }
   const std::string start = std::string(rule.netlister ? rule.netlister.get() : "") + " ";
   std::string command = start + expanded;
-  if (options.keep_names_in_place(start, options_template, command)) return command;
-  la_launcher_message().issueError(
-      "Launcher: The name of a file or directory, or a library entry, would change the arguments "
-      "of %s, which is therefore not run: %s\n",
-      rule.netlister.get(), command.c_str());
+  const char* netlister = rule.netlister;
+  if (!options.keeps_words(start, options_template, command)) {
+    la_launcher_message().issueError(
+        "Launcher: The name of a file or directory, or a library entry, would change the arguments "
+        "of %s, which is therefore not run: %s\n",
+        netlister, command.c_str());
+  } else if (const auto misplaced = options.misplaced_value(start, options_template)) {
+    la_launcher_message().issueError(
+        "Launcher: \"%s\" cannot stand between the quotes of the options of %s, which is therefore "
+        "not run: %s\n",
+        misplaced->value.c_str(), netlister, misplaced->reason.c_str());
+  } else {
+    return command;
+  }
   ++report.errors;
   return {};
 }

@@ -422,7 +422,8 @@ RULES=a; a=.edf,.kbo,,nl,,exit=3,w,,,0,>2,3     | d.edf w/ | d | run exit=3, 0 ~
 RULES=a; a=.edf,.kbo,,nl,,kill=9,w,,,<129       | d.edf w/ | d | run kill=9, E nl exited with errors (return code 137)., -1 E1
 RULES=a; a=.edf,.kbo,,no/nl,,x,w,,,0            | d.edf w/ | d | Executing no/nl x, E Failed to launch program no/nl: No such file or directory, -1 E1
 RULES=a,b; a=.edf,.kbo,,nl,,,NONE,,,0; b=.sch,.edf,,nl,,say=1%s%n err=b close exit=4,w,,,4 | d.sch w/ | -d d | Using rule b, d.edf being compiled because it does not exist, Running nl from ~/w/, + + run say=1%s%n err=b close exit=4, S 1%s%n, S b, nl exited with an exit code of 4, Using rule a, d.kbo being compiled because it does not exist, Running nl from ~/, + + run , nl exited with an exit code of 0, 0 ~/d.sch ~/d.kbo
-RULES=a; a=.edf,.kbo,,nl,,-o$OUTPUT {'-l $libraries' },,,,0 | d.edf | -n -o a -l "a b" -l "" d | run -o~/a/ '-l a b' '-l ' , 0 ~/d.edf ~/a/d.kbo
+RULES=a; a=.edf,.kbo,,nl,,-o$OUTPUT {'-l=$libraries' }{$libraries },,,,0 | d.edf | -n -o a -l "a;b" -l "" -l " c" d | run -o~/a/ '-l=a;b' '-l=' '-l= c' a;b c , 0 ~/d.edf ~/a/d.kbo
+RULES=a; a=.edf,.kbo,,nl,,'[$part] $infile;map',,,,0 | d;x.edf e$.edf | -n -p d-1-p2 d;x e$ | run 'd-1-p2 "d;x.edf";map', 0 ~/d;x.edf ~/d;x.kbo, E Launcher: "e$.edf" cannot stand between the quotes of the options of nl, which is therefore not run: it holds the character $, -1 E1
 RULES=a; a=.edf,.kbo,,nl,,-o$OUTPUT {-l$libraries },,,,0 | d.edf | -n -o a -l "a b" d | E Launcher: nl, which is therefore not run: nl -o~/a/ -la b , -1 E1
 RULES=a; a=.edf,.kbo,,nl,,-o$OUTPUT,,,,0        | d.edf    | -o "a b" d  | E Launcher: nl, which is therefore not run: nl -o~/a b/, -1 E1
 RULES=a; a=.edf,.kbo,,nl,,args 'x -o $OUTPUT y,,,,0 | d.edf | -o "it's" d  | E Launcher: nl, which is therefore not run: nl args 'x -o ~/it's/ y, -1 E1
@@ -453,6 +454,32 @@ TEST(Run, TakesAFileNameForOneArgument) {
       if (start != name) words = {"-o", name, "-sd", name, "d"};
       EXPECT_EQ(world.find(words), replaced(expected, "\n", ", ")) << start;
     }
+  }
+}
+
+TEST(Run, LetsAValueHoldWhatIsSafeWhereItStands) {
+  std::string controls;
+  for (char c = 1; c < ' '; ++c) controls += c;
+  // The template; the characters of a library entry that would change the arguments, and those
+  // that could end the text of a quoted one.
+  const std::string rows[][3] = {
+      {"{-l $libraries }$infile", "\t \"", ""},
+      {"{'-l=$libraries' }$infile", "'", "\""},
+      {"{'-l \"$libraries\"' }$infile", "'", controls + "\"$[\\`\x7f"},
+      {"'{$libraries };' $infile", "'", controls + " !\"#$&()*;<>?[\\^`{|\x7f"},
+      {"{\"-l '$libraries'\" }$infile", "\"", controls + "$'[\\`\x7f"}};
+  for (const auto& [options, changing, unsafe] : rows) {
+    World world("RULES=a; a=.edf,.kbo,,nl,," + options + ",,,,0");
+    world.tree.write("d.edf", "");
+    std::string seen_changing, seen_unsafe;
+    for (int c = 1; c < 256; ++c) {
+      const std::string entry = std::string("x") + static_cast<char>(c) + "y";
+      const std::string said = world.find({"-n", "-l", entry, "d"});
+      if (said.starts_with("E Launcher: nl, which")) seen_changing += entry[1];
+      if (said.find("y\" cannot stand between") != said.npos) seen_unsafe += entry[1];
+      EXPECT_TRUE(said.starts_with("run ") || said.find(", -1 E") != said.npos) << said;
+    }
+    EXPECT_EQ(seen_changing + " | " + seen_unsafe, changing + " | " + unsafe) << options;
   }
 }
 
