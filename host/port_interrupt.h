@@ -2,8 +2,6 @@
 #ifndef KESTREL_HOST_PORT_INTERRUPT_H
 #define KESTREL_HOST_PORT_INTERRUPT_H
 
-#include <sys/types.h>
-
 /// Interrupts what Port_Process::Run waits for, on behalf of a signal handler or another thread.
 ///
 /// Nothing here happens on its own: a process that never calls Request is never interrupted, and
@@ -22,21 +20,13 @@ class Port_Interrupt {
 
   /// true: children that start from now on lead process groups of their own. Signals of the
   /// terminal then reach them through this class only, which passes them on to all that a child
-  /// has started in its group; once an interrupted child has ended, what is left of its group is
-  /// given a second, then killed. false, as at the start: children belong to the group of this
+  /// has started in its group; once an interrupted child has ended, what still lives of its group
+  /// is given a second, then killed. false, as at the start: children belong to the group of this
   /// process, and only the child itself is interrupted.
   static void SetOwnGroups(bool own);
   /// Sends a signal to the running child, or its group, and nothing more. For SIGTSTP and SIGCONT.
   /// May be called from a signal handler and from any thread; leaves errno alone.
   static void PassOn(int signal);
-
- private:
-  friend class Port_Process;
-
-  static bool own_groups();
-  static void child_started(pid_t child);
-  static void child_ended();
-  static void child_reaped(pid_t child);
 };
 
 #endif

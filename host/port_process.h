@@ -18,7 +18,7 @@ class Port_Process {
   enum PROCESS_STATUS {
     PROCESS_ENDED = 0,   ///< the program was started and has ended
     PROCESS_FAILED = 1,  ///< it could not be started
-    PROCESS_LOST = 2,    ///< it was started, but its exit code could not be learnt
+    PROCESS_LOST = 2,    ///< it was started, but could not be followed to its end
   };
 
   /// mode 2: what the program writes to its standard output and error goes to Output, line by
@@ -42,19 +42,24 @@ class Port_Process {
   /// that it left behind still holds its output open.
   ///
   /// While it waits, SIGCHLD has its default action, so that a host that ignores it, or collects
-  /// every child, does not take the exit code away. A handler of the host is called once when it
-  /// is back, as it may have missed a child of its own.
+  /// every child, does not take the exit code away. Where that was not so already, the host has
+  /// afterwards what it would have had: its handler is called once, as it may have missed a child
+  /// of its own, and where children are to leave no trace, those that have ended are reaped.
+  ///
+  /// The program has been waited for whatever happens, also when Output throws. Memory that runs
+  /// out is a failure like others.
   PROCESS_STATUS Run(const char* command);
   /// The exit code of the program that Run waited for; 128 + N when signal N ended it.
   int GetChildRetcode() const { return exit_code_; }
   /// Why Run failed. The text belongs to this object.
-  wchar_t* GetProcessErrmsg() const { return const_cast<wchar_t*>(error_.c_str()); }
+  wchar_t* GetProcessErrmsg() const;
 
   /// Splits a command line into the program and its arguments. False when a quote is without its
   /// partner.
   static bool Split(const std::string& command, std::vector<std::string>& words);
 
  private:
+  PROCESS_STATUS run(const std::string& command);
   PROCESS_STATUS fail(const std::string& program, const std::string& reason);
 
   int mode_;

@@ -1,12 +1,14 @@
 #include "host/port_interrupt.h"
 
 #include <signal.h>
-#include <sys/wait.h>
 #include <time.h>
 
 #include <atomic>
 #include <cerrno>
 #include <limits>
+
+#include "host/system/process_group.h"
+#include "host/system/running_child.h"
 
 namespace {
 
@@ -42,14 +44,11 @@ void pass_on_requests() {
   ::kill(target, SIGCONT);
 }
 
-/// Waits for a process group to empty, for a second at the most.
+/// Waits until nothing in a process group lives, for a second at the most.
 bool is_gone(pid_t group) {
   constexpr timespec MOMENT = {0, 10'000'000};
   for (int i = 0; i < 100; ++i) {
-    // Members that nobody reaps stay in the group. Where orphans come to this process, it does.
-    while (::waitpid(-group, nullptr, WNOHANG) > 0) {
-    }
-    if (::kill(-group, 0) != 0) return true;
+    if (!la_group_lives(group)) return true;
     ::nanosleep(&MOMENT, nullptr);
   }
   return false;
@@ -90,26 +89,22 @@ void Port_Interrupt::PassOn(int signal) {
   errno = error;
 }
 
-bool Port_Interrupt::own_groups() {
+bool la_running_child::leads_group() {
   return groups;
 }
 
-/// Requests go to this child now, also one that came while it was started.
-void Port_Interrupt::child_started(pid_t child) {
+void la_running_child::started(pid_t child) {
   passed_on = 0;
   running = groups ? -child : child;
   pass_on_requests();
 }
 
-/// To be called before the child is reaped: its number may be that of another process then. That
-/// of a group stays as long as the group has members.
-void Port_Interrupt::child_ended() {
+void la_running_child::ended() {
   if (!groups) running = 0;
 }
 
-/// Ends what an interrupted child has left in its group.
-void Port_Interrupt::child_reaped(pid_t child) {
-  if (groups && Requested() != 0 && !is_gone(child)) {
+void la_running_child::reaped(pid_t child) {
+  if (groups && Port_Interrupt::Requested() != 0 && !is_gone(child)) {
     ::kill(-child, SIGKILL);
     is_gone(child);
   }
