@@ -61,6 +61,7 @@ resolution resolved(LA_LAUNCHER& launcher, const std::string& name, bool top) {
   char netlist[LA_MAX_PATH];
   const int runs_before = launcher.runs;
   found.result = launcher.find(name.c_str(), source, netlist, top);
+  reap_orphans();
   found.is_built = launcher.runs > runs_before;
   found.source = source;
   found.netlist = full_name(netlist);

@@ -1,6 +1,7 @@
 #include "cli/signals.h"
 
 #include <sys/prctl.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include "cli/console.h"
@@ -74,5 +75,10 @@ signal_handling::~signal_handling() {
   ::sigprocmask(SIG_SETMASK, &mask_before_, nullptr);
   for (std::size_t i = 0; i < COUNT; ++i) {
     ::sigaction(REACTIONS[i].signal, &before_[i], nullptr);
+  }
+}
+
+void reap_orphans() {
+  while (::waitpid(-1, nullptr, WNOHANG) > 0) {
   }
 }

@@ -23,4 +23,8 @@ class signal_handling {
   sigset_t mask_before_ = {};
 };
 
+/// Reaps what netlisters have left behind and has ended since: it comes to this process while
+/// signal_handling lives. Not to be called while a child is waited for.
+void reap_orphans();
+
 #endif

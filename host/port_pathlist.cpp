@@ -1,16 +1,12 @@
 #include "host/port_pathlist.h"
 
-#include <dlfcn.h>
-
 #include <algorithm>
-#include <cstdlib>
-#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
 
 #include "host/port_env.h"
-#include "host/port_file.h"
+#include "host/system/program_place.h"
 
 #ifndef KESTREL_DATA_DIR
 #define KESTREL_DATA_DIR "/usr/share/kestrel-launcher"
@@ -39,26 +35,11 @@ void add_roots(Roots& roots, const Setting& list) {
   }
 }
 
-/// The directory at path with its links resolved; empty when there is none.
-std::string resolved(const std::string& path) {
-  const std::unique_ptr<char, decltype(&::free)> full(::realpath(path.c_str(), nullptr), ::free);
-  return full ? full.get() : "";
-}
-
-std::string directory_of(const std::string& path) {
-  return path.substr(0, path.rfind('/') + 1);
-}
-
 /// The data beside the program, or beside this library where that is shared, so that both may be
 /// moved; else where the build was told to install it.
 std::string installed_root() {
-  Dl_info library = {};
-  ::dladdr(reinterpret_cast<void*>(&installed_root), &library);
-  const std::string bin = directory_of(resolved("/proc/self/exe"));
-  const std::string lib = directory_of(resolved(library.dli_fname ? library.dli_fname : ""));
-  // Libraries may lie one level deeper, in a directory for the kind of machine.
-  for (const std::string& place : {bin + "..", lib + "..", lib + "../.."}) {
-    std::string root = resolved(place + "/share/kestrel-launcher");
+  for (const std::string& place : la_program_places()) {
+    std::string root = la_resolved(place + "/share/kestrel-launcher");
     if (!root.empty()) return root;
   }
   return KESTREL_DATA_DIR;

@@ -7,13 +7,13 @@
 #include "host/system/child.h"
 #include "host/utf8.h"
 
-Port_Process::PROCESS_STATUS Port_Process::fail(const std::string& program,
-                                                const std::string& reason) {
+bool Port_Process::fail(const std::string& program, const std::string& reason) {
   error_ = from_utf8(program) + L": " + from_utf8(reason);
-  return PROCESS_FAILED;
+  return false;
 }
 
-Port_Process::PROCESS_STATUS Port_Process::run(const std::string& command) {
+/// Returns whether the program was started and has ended.
+bool Port_Process::run(const std::string& command, bool& was_started) {
   std::vector<std::string> words;
   if (!Split(command, words)) return fail(command, "a quote is without its partner");
   // The program's name ends at the first blank: one that is missing is not made up for by the
@@ -33,18 +33,19 @@ Port_Process::PROCESS_STATUS Port_Process::run(const std::string& command) {
     };
   }
   Pause();
-  const la_child_end end = la_run_child(words, take);
+  const la_child_end end = la_run_child(words, take, was_started);
   exit_code_ = end.exit_code;
-  return end.failure.empty() ? PROCESS_ENDED : fail(words[0], end.failure);
+  return end.failure.empty() || fail(words[0], end.failure);
 }
 
 Port_Process::PROCESS_STATUS Port_Process::Run(const char* command) {
+  bool was_started = false;
   try {
-    return run(command);
+    if (run(command, was_started)) return PROCESS_ENDED;
   } catch (const std::bad_alloc&) {
     error_.clear();
-    return PROCESS_FAILED;
   }
+  return was_started ? PROCESS_LOST : PROCESS_FAILED;
 }
 
 wchar_t* Port_Process::GetProcessErrmsg() const {

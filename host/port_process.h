@@ -59,8 +59,8 @@ class Port_Process {
   static bool Split(const std::string& command, std::vector<std::string>& words);
 
  private:
-  PROCESS_STATUS run(const std::string& command);
-  PROCESS_STATUS fail(const std::string& program, const std::string& reason);
+  bool run(const std::string& command, bool& was_started);
+  bool fail(const std::string& program, const std::string& reason);
 
   int mode_;
   int exit_code_ = 0;

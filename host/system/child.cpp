@@ -135,7 +135,8 @@ la_child_end failed(const char* what, int error) {
 
 }  // namespace
 
-la_child_end la_run_child(std::vector<std::string>& words, const la_take_output& take) {
+la_child_end la_run_child(std::vector<std::string>& words, const la_take_output& take,
+                          bool& was_started) {
   pipe_ends ends;
   if (take != nullptr) {
     if (const int error = open_pipe(ends)) return failed("", error);
@@ -147,6 +148,7 @@ la_child_end la_run_child(std::vector<std::string>& words, const la_take_output&
     return failed("", error);
   }
   child_process child(number, std::move(ends.read));
+  was_started = true;
   ends.write.close();
   int read_error = 0;
   if (take != nullptr) {

@@ -21,8 +21,9 @@ using la_take_output = std::function<void(char* block, std::size_t length)>;
 constexpr std::size_t LA_OUTPUT_BLOCK = 65536;
 
 /// Starts the program words[0] with the arguments that follow it, and returns when it has ended.
-/// It writes to where this process does when take is empty. Whatever happens, and if take throws,
-/// the child has been reaped at the end.
-la_child_end la_run_child(std::vector<std::string>& words, const la_take_output& take);
+/// It writes to where this process does when take is empty. Sets was_started as soon as it runs;
+/// whatever happens then, and if take throws, it has been reaped at the end.
+la_child_end la_run_child(std::vector<std::string>& words, const la_take_output& take,
+                          bool& was_started);
 
 #endif

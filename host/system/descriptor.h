@@ -21,6 +21,8 @@ class la_descriptor {
     if (number_ >= 0) ::close(std::exchange(number_, -1));
   }
   int get() const { return number_; }
+  /// From now on somebody else closes it.
+  void release() { number_ = -1; }
 
  private:
   int number_;
