@@ -10,7 +10,7 @@
 #include <cstdlib>
 #include <utility>
 
-#include "host/utf8.h"
+#include "host/base/utf8.h"
 
 namespace {
 

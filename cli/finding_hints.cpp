@@ -6,7 +6,7 @@
 
 #include "cli/nearest.h"
 #include "file/baslafile.h"
-#include "host/blanks.h"
+#include "host/base/blanks.h"
 #include "launcher/command_options.h"
 #include "rules/rule_fields.h"
 

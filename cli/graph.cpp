@@ -3,7 +3,7 @@
 #include <array>
 
 #include "cli/relations.h"
-#include "host/utf8.h"
+#include "host/base/utf8.h"
 
 namespace {
 

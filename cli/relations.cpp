@@ -4,7 +4,7 @@
 #include <cstdint>
 #include <map>
 
-#include "host/text_numbers.h"
+#include "host/base/text_numbers.h"
 
 namespace {
 

@@ -2,8 +2,8 @@
 
 #include <cstring>
 
+#include "host/base/utf8.h"
 #include "host/ut_str.h"
-#include "host/utf8.h"
 
 // The analyzer does not see that the callers have started the list.
 // NOLINTBEGIN(clang-analyzer-valist.Uninitialized)

@@ -3,9 +3,9 @@
 #include <new>
 
 #include "host/base/line_cutter.h"
+#include "host/base/utf8.h"
 #include "host/port_interrupt.h"
 #include "host/system/child.h"
-#include "host/utf8.h"
 
 bool Port_Process::fail(const std::string& program, const std::string& reason) {
   error_ = from_utf8(program) + L": " + from_utf8(reason);

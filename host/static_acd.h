@@ -7,7 +7,7 @@
 #include <string_view>
 #include <unordered_map>
 
-#include "host/blanks.h"
+#include "host/base/blanks.h"
 #include "host/port_string.h"
 
 /// Reads one static data file. A line that begins with a blank continues the value above it, with

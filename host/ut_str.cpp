@@ -4,7 +4,7 @@
 #include <cstring>
 #include <string_view>
 
-#include "host/blanks.h"
+#include "host/base/blanks.h"
 
 namespace {
 

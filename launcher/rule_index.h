@@ -5,7 +5,7 @@
 #include <utility>
 #include <vector>
 
-#include "host/text_numbers.h"
+#include "host/base/text_numbers.h"
 #include "rules/baslarules.h"
 
 using DARRAY_LA_RULE_CONST_PTR = UT_TYPED_DARRAY<const LA_RULE*>;

@@ -3,7 +3,7 @@
 #include <climits>
 #include <string_view>
 
-#include "host/blanks.h"
+#include "host/base/blanks.h"
 #include "host/ut_str.h"
 #include "rules/message.h"
 

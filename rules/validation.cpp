@@ -4,7 +4,7 @@
 #include <utility>
 #include <vector>
 
-#include "host/text_numbers.h"
+#include "host/base/text_numbers.h"
 #include "optparse/baslaoptparse.h"
 #include "rules/conversion.h"
 #include "rules/message.h"

@@ -4,13 +4,13 @@
 
 #include <filesystem>
 
+#include "host/base/utf8.h"
 #include "host/pm_devkey.h"
 #include "host/port_file.h"
 #include "host/port_pathlist.h"
 #include "host/port_process.h"
 #include "host/static_acd.h"
 #include "host/ut_darray.h"
-#include "host/utf8.h"
 #include "support.h"
 
 struct Host : testing::Test {

@@ -1,4 +1,4 @@
-#include "host/utf8.h"
+#include "host/base/utf8.h"
 
 #include <algorithm>
 

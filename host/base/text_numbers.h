@@ -1,6 +1,6 @@
 // Numbers for texts.
-#ifndef KESTREL_HOST_TEXT_NUMBERS_H
-#define KESTREL_HOST_TEXT_NUMBERS_H
+#ifndef KESTREL_HOST_BASE_TEXT_NUMBERS_H
+#define KESTREL_HOST_BASE_TEXT_NUMBERS_H
 
 #include <cstddef>
 #include <functional>

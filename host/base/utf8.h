@@ -1,6 +1,6 @@
 // Wide text and UTF-8.
-#ifndef KESTREL_HOST_UTF8_H
-#define KESTREL_HOST_UTF8_H
+#ifndef KESTREL_HOST_BASE_UTF8_H
+#define KESTREL_HOST_BASE_UTF8_H
 
 #include <string>
 #include <string_view>

@@ -1,6 +1,6 @@
 // Blanks: the space and the tab.
-#ifndef KESTREL_HOST_BLANKS_H
-#define KESTREL_HOST_BLANKS_H
+#ifndef KESTREL_HOST_BASE_BLANKS_H
+#define KESTREL_HOST_BASE_BLANKS_H
 
 #include <string_view>
 
