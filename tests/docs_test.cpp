@@ -115,8 +115,9 @@ TEST(Docs, GuideHasARowForEveryMessage) {
   // A comment, a character, or literals perhaps behind the name of a function.
   const std::regex token(R"re(//.*|'\\?.'|(\w*\()?((?:"(?:[^"\\]|\\.)*"\s*)+))re");
   for (const char* folder : {"file", "host", "launcher", "optparse", "rules"}) {
-    const std::filesystem::directory_iterator files(KESTREL_SOURCE_DIR "/" + std::string(folder));
-    for (const auto& file : files) {
+    const std::string path = KESTREL_SOURCE_DIR "/" + std::string(folder);
+    for (const auto& file : std::filesystem::recursive_directory_iterator(path)) {
+      if (file.is_directory()) continue;
       const std::string code = slurp(file.path());
       for (std::sregex_iterator at(code.begin(), code.end(), token), end; at != end; ++at) {
         const std::string literals = at->str(2);
