@@ -3,6 +3,7 @@
 #include <cstdlib>
 #include <fstream>
 #include <string_view>
+#include <utility>
 
 #include "cli/nearest.h"
 #include "file/baslafile.h"
@@ -135,8 +136,9 @@ void finding_hints::add(const std::string& error) {
     std::string hint =
         hint_of(error.substr(start, error.find(after, start) - start), {lines_, number});
     if (hint.empty()) continue;
+    if (!given_.insert(hint).second) return;
     if (has_line) hint.insert(0, "\"" + file + "\", line " + std::to_string(number) + ": ");
-    if (given_.insert(hint).second) hints_.push_back(hint);
+    hints_.push_back(std::move(hint));
     return;
   }
 }

@@ -8,16 +8,16 @@
 
 namespace {
 
-/// A rule by numbers: of its kinds, source and target, and of the only name that it is for.
+/// A rule as numbers: its source kind, its target kind, and the only name that it is for.
 using numbered_rule = std::array<std::size_t, 3>;
 
-/// For each kind, what rules make of it, or what they make it from.
+/// For each kind, the kinds that rules make from it, or make it from.
 using kind_graph = std::vector<std::vector<std::size_t>>;
 
 constexpr std::size_t NONE = SIZE_MAX;
 
-/// Puts a kind, and all that can be reached from it, into a group. Those that are in one stay
-/// there, and nothing is looked for beyond them.
+/// Puts a kind, and all that can be reached from it, into a group. Kinds that are in a group stay
+/// there and are not passed.
 void collect(const kind_graph& graph, std::size_t kind, std::size_t group,
              std::vector<std::size_t>& groups) {
   std::vector<std::size_t> rest;
@@ -34,9 +34,8 @@ void collect(const kind_graph& graph, std::size_t kind, std::size_t group,
   }
 }
 
-/// All kinds, in the order in which a search into the depth is done with them: each behind those
-/// that it leads to, but for what is in a loop with it.
-std::vector<std::size_t> with_targets_first(const kind_graph& targets) {
+/// All kinds in depth-first post-order: each after its targets, unless they are in a loop with it.
+std::vector<std::size_t> in_post_order(const kind_graph& targets) {
   std::vector<std::size_t> done;
   std::vector<std::size_t> tried(targets.size());
   std::vector<bool> entered(targets.size());
@@ -60,11 +59,12 @@ std::vector<std::size_t> with_targets_first(const kind_graph& targets) {
   return done;
 }
 
-/// The loop that each kind is in. One that is in none is alone in its own.
+/// The loop that each kind is in, by the number of one of its kinds (Kosaraju's algorithm). A kind
+/// in no loop is alone in its own.
 std::vector<std::size_t> loops_of(const kind_graph& sources, const kind_graph& targets) {
-  const std::vector<std::size_t> kinds = with_targets_first(targets);
+  const std::vector<std::size_t> kinds = in_post_order(targets);
   std::vector<std::size_t> loops(kinds.size(), NONE);
-  // What leads to a kind, and stands before it, can also be reached from it.
+  // In reverse post-order, what leads to a kind and has no loop yet can also be reached from it.
   for (auto kind = kinds.rbegin(); kind != kinds.rend(); ++kind) {
     collect(sources, *kind, *kind, loops);
   }
