@@ -1,29 +1,36 @@
-// Full names that differ in their extensions only, for when many of them are asked for.
+// Full names that differ in little, for when many of them are asked for.
 #ifndef KESTREL_FILE_FULL_ROOT_H
 #define KESTREL_FILE_FULL_ROOT_H
-
-#include <cstddef>
 
 #include "file/baslafile.h"
 #include "file/path_text.h"
 
-/// A full name that lacks its extension.
+/// Puts full names together from a directory, a root and an extension, each set once for all that
+/// follow.
 class LA_FULLROOT {
  public:
-  /// Of the files with this head and name (LA_FILE::get_root) in the directory.
-  LA_FULLROOT(const LA_DIR& directory, const char* root);
-  /// Of the files that differ from this one, which has a name and is complete.
+  /// Of files in the directory, which must outlive this object.
+  explicit LA_FULLROOT(const LA_DIR& directory);
+  /// Of files that differ from this one in their extensions; it is complete, and outlives this
+  /// object.
   explicit LA_FULLROOT(const LA_FULLFILE& file);
 
-  /// LA_FULLFILE::get_fullfile of the file with this extension, which has no "/"; null stands for
-  /// no extension. Null when there is none or it does not fit. Good until the next call.
+  const LA_DIR& directory() const { return directory_; }
+  /// From now on names files with this head and name, as LA_FILE::get_root gives them; null for
+  /// none.
+  void set_root(const char* root);
+  /// LA_FULLFILE::get_fullfile of the file with this extension, which has no "/"; null when there
+  /// is none. Good until the next call of either.
   const char* with_ext(const char* ext);
 
  private:
-  la_path_text text_;       ///< the root, and behind it the extension of the last call
-  std::size_t length_ = 0;  ///< of the root
-  /// For dot, extension and terminator. They have to fit behind the name as it was before it was
-  /// brought into its normal form, as in LA_FULLFILE.
+  const LA_DIR& directory_;
+  std::size_t directory_length_ = 0;  ///< as it is written; 0 when there is none
+  la_path_text normal_directory_;
+  la_path_text text_;
+  std::size_t root_length_ = 0;  ///< of the text, without extension
+  /// For dot, extension and terminator: less than the text has left where its normal form is the
+  /// shorter one.
   std::size_t room_ = 0;
 };
 

@@ -11,12 +11,12 @@ static bool leave_directory(la_path_text& path) {
   return true;
 }
 
+bool la_is_normal(std::string_view path) {
+  return path.find("./") == path.npos && path.find('\\') == path.npos;
+}
+
 void la_normalise(la_path_text& path) {
-  if (path.view().find("./") == std::string_view::npos &&
-      path.view().find('\\') == std::string_view::npos) {
-    return;
-  }
-  if (!path.fits()) return;
+  if (la_is_normal(path.view()) || !path.fits()) return;
   const la_path_text internal(path.chars());
   la_path_text normal;
   for (std::string_view rest = internal.view(); !rest.empty();) {

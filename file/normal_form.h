@@ -4,6 +4,9 @@
 
 #include "file/path_text.h"
 
+/// Whether a path, or a part of one that is made of whole names, is in its normal form.
+bool la_is_normal(std::string_view path);
+
 /// Resolves "./" and "../", wherever they stand in path. A path whose "../" would climb above the
 /// first directory stays as it is.
 void la_normalise(la_path_text& path);

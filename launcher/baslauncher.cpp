@@ -111,6 +111,7 @@ struct LA_LAUNCHER::la_finding {
 
   la_rule_index rules;
   la_home home;
+  std::vector<LA_FULLROOT> searchpaths;  ///< those of the launcher, as far as finds have used them
   // Of the last find.
   bool is_netlist_seen = false;
   std::vector<LA_RUN> runs;
@@ -234,7 +235,7 @@ short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) {
 short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
                                 unsigned char top) {
   const la_report report = {detail != 0, errors, warnings};
-  auto& [index, home, is_netlist_seen, runs_of_find, why, ask_host] = *finding;
+  auto& [index, home, places, is_netlist_seen, runs_of_find, why, ask_host] = *finding;
   home.settle();
   LA_FULLFILE given(home.dir(), name);
   const bool named_kbc = given.match_ext("kbc");
@@ -245,7 +246,10 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
   }
   if (is_interrupted(given, report)) return LA_FAILED;
 
-  la_lookup where(given, counted(searchpaths, num_searchpaths), home, why);
+  for (const auto& directory : counted(searchpaths, num_searchpaths).subspan(places.size())) {
+    places.emplace_back(*directory);
+  }
+  la_lookup where(given, places, home, why);
   const Port::FileStatus named_status = find_named(given, where);
   const auto find_input = [&](const char* ext, la_found_file& found) {
     if (!named_found) return where.find_file(ext, found);

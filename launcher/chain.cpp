@@ -23,8 +23,10 @@ class chain_build {
         home_(home),
         report_(report),
         why_(why),
-        outputs_(settings.output_dir, source.file.get_name()),
-        input_status_(source.status) {}
+        outputs_(settings.output_dir),
+        input_status_(source.status) {
+    outputs_.set_root(source_.get_name());
+  }
 
   /// The full name of what a rule makes, good until the next call; null when there is none.
   const char* output_of(const LA_RULE& rule) { return outputs_.with_ext(rule.target->get_ext()); }

@@ -3,15 +3,15 @@
 #include <string_view>
 
 void la_home::settle() {
-  dir_.set_dir(nullptr);
-  const char* name = dir_.get_dir();
-  if (name == nullptr) {
-    prefix_.clear();
-  } else if (!is_sure_ || prefix_ != name) {
-    // A netlister may have put another directory in its place.
-    prefix_ = Port::File::same(name, ".") ? name : "";
-  }
+  char cwd[LA_MAX_PATH];
+  Port::File::getcwd(cwd, sizeof cwd);
+  if (is_sure_ && cwd_ == cwd) return;
+  cwd_ = cwd;
   is_sure_ = true;
+  dir_.set_dir(cwd);
+  const char* name = dir_.get_dir();
+  // A netlister may have put another directory in its place.
+  prefix_ = name != nullptr && Port::File::same(name, ".") ? name : "";
 }
 
 const char* la_home::relative(const char* path) const {

@@ -24,6 +24,7 @@ class la_home {
   Port::FileStatus status(const char* path) const;
 
  private:
+  std::string cwd_;  ///< the directory as the system names it
   LA_DIR dir_;
   std::string prefix_;  ///< its name, with "/" at its end; empty when that does not lead to it
   bool is_sure_ = false;

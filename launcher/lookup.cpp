@@ -1,14 +1,14 @@
 #include "launcher/lookup.h"
 
-#include <cstring>
+#include <utility>
 
 #include "host/port_string.h"
 #include "launcher/message.h"
 
-la_lookup::la_lookup(const LA_FULLFILE& given, la_search_directories directories,
+la_lookup::la_lookup(const LA_FULLFILE& given, std::span<LA_FULLROOT> searchpaths,
                      const la_home& home, LA_EXPLANATION* why)
     : given_(given),
-      directories_(directories),
+      searchpaths_(searchpaths),
       home_(home),
       why_(why),
       root_(given.get_root()),
@@ -26,24 +26,23 @@ bool la_lookup::find_file(const char* ext, la_found_file& found) {
 
 /// Visits all search directories, so that the report on files passed over is complete.
 bool la_lookup::find_in_searchpaths(const char* ext, la_found_file& found) {
-  if (in_searchpaths_.empty() && !directories_.empty()) {
+  if (!std::exchange(has_searched_, true)) {
     // A head may begin with a drive, which is dropped.
     const LA_FILE relative((root_ + ".").c_str());
     const char* root = relative.get_root();
-    in_searchpaths_.reserve(directories_.size());
-    for (const auto& directory : directories_) in_searchpaths_.emplace_back(*directory, root);
+    for (LA_FULLROOT& place : searchpaths_) place.set_root(root);
   }
   bool found_any = false;
   Port::StringBase<char> first;
   Port::StringBase<char> others;
-  for (std::size_t i = 0; i < directories_.size(); ++i) {
-    const char* path = in_searchpaths_[i].with_ext(ext);
+  for (LA_FULLROOT& place : searchpaths_) {
+    const char* path = place.with_ext(ext);
     const Port::FileStatus status = look_at(path);
     if (!status.exists) continue;
     const Port::StringBase<char> name(path);
     if (!found_any) {
       note(LA_EXPLANATION::FOUND, path);
-      found = {LA_FULLFILE(*directories_[i], name_with(ext).c_str()), status};
+      found = {LA_FULLFILE(place.directory(), name_with(ext).c_str()), status};
       first = name;
       found_any = true;
     } else if (!(name == first) && others.GetIndexOfString(name, Port::StringBase<char>::EXACT) ==

@@ -2,11 +2,9 @@
 #ifndef KESTREL_LAUNCHER_LOOKUP_H
 #define KESTREL_LAUNCHER_LOOKUP_H
 
-#include <memory>
 #include <set>
 #include <span>
 #include <string>
-#include <vector>
 
 #include "file/baslafile.h"
 #include "file/full_root.h"
@@ -20,15 +18,14 @@ struct la_found_file {
   Port::FileStatus status;
 };
 
-using la_search_directories = std::span<const std::unique_ptr<LA_DIR>>;
-
 /// Looks for the files of one name: where the name says, then in the search directories. What a
 /// failed run has left counts as missing.
 class la_lookup {
  public:
-  /// All that it is given must outlive it. home is the current directory. why may be null; else it
-  /// gets every place that is looked at.
-  la_lookup(const LA_FULLFILE& given, la_search_directories directories, const la_home& home,
+  /// All that it is given must outlive it. searchpaths: the search directories; their roots are set
+  /// here. home is the current directory. why may be null; else it gets every place that is looked
+  /// at.
+  la_lookup(const LA_FULLFILE& given, std::span<LA_FULLROOT> searchpaths, const la_home& home,
             LA_EXPLANATION* why);
 
   /// Looks for the file with this extension, and writes it into found if there is one.
@@ -41,13 +38,13 @@ class la_lookup {
   std::string name_with(const char* ext) const;
 
   const LA_FULLFILE& given_;
-  const la_search_directories directories_;
+  const std::span<LA_FULLROOT> searchpaths_;
   const la_home& home_;
   LA_EXPLANATION* const why_;
-  const std::string root_;                   ///< head and name
-  LA_FULLROOT beside_;                       ///< where the name says
-  std::vector<LA_FULLROOT> in_searchpaths_;  ///< made when the first of them is needed
-  std::set<std::string> told_;               ///< what the user knows to be left by a failed run
+  const std::string root_;      ///< head and name
+  LA_FULLROOT beside_;          ///< where the name says
+  bool has_searched_ = false;   ///< the roots of the search directories are set
+  std::set<std::string> told_;  ///< what the user knows to be left by a failed run
 };
 
 /// Tells that a file which a failed run has left is passed over.
