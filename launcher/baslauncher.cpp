@@ -78,6 +78,10 @@ void report_loop(std::vector<int> path, const la_rule_index& rules, const la_rep
   ++report.errors;
 }
 
+void report_bad_setup(const std::exception& failure) {
+  la_launcher_message().issueError("Launcher: Could not be set up: %s\n", failure.what());
+}
+
 /// Adds what was planned to the explanation.
 void explain(const la_plan& plan, bool is_named, const la_rule_index& rules, LA_EXPLANATION& why) {
   for (LA_EXPLANATION::CONSIDERED& considered : why.rules) {
@@ -129,7 +133,7 @@ LA_LAUNCHER::LA_LAUNCHER(const char* part_name, const char** searchpaths, short 
       force(force),
       ignore_timestamps(ignore_timestamps) {
   try {
-    if (searchpaths != nullptr) add_searchpaths(searchpaths, num_searchpaths);
+    if (searchpaths != nullptr) append_searchpaths(searchpaths, num_searchpaths);
     if (libraries != nullptr) {
       this->libraries.reset(new la_text[static_cast<std::size_t>(num_libraries)]);
       this->num_libraries = num_libraries;
@@ -145,13 +149,22 @@ LA_LAUNCHER::LA_LAUNCHER(const char* part_name, const char** searchpaths, short 
     finding = std::make_unique<la_finding>(*rules);
     ok = rules->is_valid;
   } catch (const std::exception& failure) {
-    la_launcher_message().issueError("Launcher: Could not be set up: %s\n", failure.what());
+    report_bad_setup(failure);
   }
 }
 
 LA_LAUNCHER::~LA_LAUNCHER() = default;
 
 void LA_LAUNCHER::add_searchpaths(const char** new_paths, short num_new_paths) {
+  try {
+    append_searchpaths(new_paths, num_new_paths);
+  } catch (const std::exception& failure) {
+    report_bad_setup(failure);
+  }
+}
+
+/// As add_searchpaths, but may throw.
+void LA_LAUNCHER::append_searchpaths(const char** new_paths, short num_new_paths) {
   const int total = num_searchpaths + num_new_paths;
   if (total > SHRT_MAX) {
     la_launcher_message().issueError("Launcher: There can be at most %d search directories.\n",
@@ -235,7 +248,10 @@ short LA_LAUNCHER::find_disabled(const char* name, char* netlist_path) {
 short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netlist_path,
                                 unsigned char top) {
   const la_report report = {detail != 0, errors, warnings};
-  auto& [index, home, places, is_netlist_seen, runs_of_find, why, ask_host] = *finding;
+  const la_rule_index& index = finding->rules;
+  la_home& home = finding->home;
+  std::vector<LA_FULLROOT>& places = finding->searchpaths;
+  LA_EXPLANATION* const why = finding->why;
   home.settle();
   LA_FULLFILE given(home.dir(), name);
   const bool named_kbc = given.match_ext("kbc");
@@ -285,7 +301,7 @@ short LA_LAUNCHER::find_enabled(const char* name, char* source_path, char* netli
   }
   UT_STR::Copy(netlist_path, file.get_fullfile());
   UT_STR::Copy(source_path, netlist_path);
-  is_netlist_seen = true;
+  finding->is_netlist_seen = true;
   return LA_FOUND;
 }
 

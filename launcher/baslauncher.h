@@ -70,12 +70,12 @@ class LA_LAUNCHER {
   /// to read may not exist; LA_DISABLE looks for the name in lower case in the search directories
   /// and does nothing else: no rules, no messages, and source_path stays empty.
   short find(const char* name, char* source_path, char* netlist_path, unsigned char top);
-  /// Appends search directories, to be searched after those that there are. A relative name is
+  /// Appends search directories, to be searched after the present ones. A relative name is
   /// relative to the current directory of this moment. More than 32767 in all are refused, with an
   /// error message.
   void add_searchpaths(const char** searchpaths, short num_searchpaths);
-  /// Of the last find that returned LA_FOUND: whether it has seen the file to read. If not, a
-  /// netlister was to write it, whose exit code was good.
+  /// Whether the last find that returned LA_FOUND has seen the file to read. If not, a netlister
+  /// was to write it, and ended with a good exit code or was only announced.
   bool saw_netlist() const;
   /// The netlisters that the last find has announced, in their order, and how they ended. Good
   /// until the next find.
@@ -86,9 +86,9 @@ class LA_LAUNCHER {
   /// The rules, which live as long as the launcher; null if memory ran out in the constructor.
   const LA_RULE_SET* rule_set() const { return rules.get(); }
   /// From now on find asks, before it looks at the first step of a chain, whether the chain that
-  /// leads from source to netlist, both full names, may be carried out. When the answer is 0, which
-  /// the host has told its user the reason of, nothing is run, and find returns LA_FAILED. context
-  /// is handed on; null for may_build ends that. It must not call the launcher.
+  /// leads from source to netlist, both full names, may be carried out. When the answer is 0,
+  /// nothing is run, and find returns LA_FAILED; the host tells its user why. context is handed on;
+  /// null for may_build ends that. It must not call the launcher.
   void ask_before_chains(unsigned char (*may_build)(void* context, const char* source,
                                                     const char* netlist),
                          void* context);
@@ -109,6 +109,7 @@ class LA_LAUNCHER {
  private:
   struct la_finding;
 
+  void append_searchpaths(const char** searchpaths, short num_searchpaths);
   short find_disabled(const char* name, char* netlist_path);
   short find_enabled(const char* name, char* source_path, char* netlist_path, unsigned char top);
   Port::FileStatus find_named(const LA_FULLFILE& given, la_lookup& where);

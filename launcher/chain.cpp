@@ -25,7 +25,8 @@ class chain_build {
         why_(why),
         outputs_(settings.output_dir),
         input_status_(source.status) {
-    outputs_.set_root(source_.get_name());
+    // As file_made_by does, takes a name like "d." for d without an extension.
+    outputs_.set_root(LA_FILE(source_.get_tail()).get_root());
   }
 
   /// The full name of what a rule makes, good until the next call; null when there is none.
@@ -84,9 +85,7 @@ class chain_build {
     return rule_before != nullptr ? file_made_by(*rule_before) : source_;
   }
   /// Name and extension of what the step makes.
-  std::string output_tail() const {
-    return std::string(source_.get_name()) + "." + rule_->target->get_ext();
-  }
+  std::string output_tail() const { return file_made_by(*rule_).get_tail(); }
 
   /// Reports the decision. Returns false when it ends the chain.
   bool report_decision(const la_decision& decision, const LA_RULE* rule_before) {
@@ -139,11 +138,15 @@ class chain_build {
       return run.rule == rule_before && run.end == LA_RUN::ENDED;
     });
     if (before == runs_.end()) return false;
+    // What a netlister that was started has left is dealt with already.
+    const LA_RUN& last = runs_.back();
+    if (last.rule == rule_ && last.end != LA_RUN::NOT_STARTED) return false;
     const LA_FULLFILE input_file = input(rule_before);
     const LA_FULLFILE output_file = file_made_by(*rule_);
+    const la_step_files files = {source_, input_file, output_file};
     const Port::FileStatus output = la_status_of(output_file.get_fullfile());
     if (output.exists && output.time >= la_status_of(before->output.c_str()).time) {
-      netlisters_->mark_stale({source_, input_file, output_file}, output);
+      netlisters_->mark_stale(netlisters_->inputs_of(*rule_, files), files, output);
     }
     return false;
   }

@@ -15,8 +15,8 @@ class LA_RULE;
 void set_keywords(la_command_options& options, const la_build_settings& settings);
 
 /// Makes the command line of a step: the rule's netlister, and the options that its template
-/// expands to; top asks for those of the top level. The names of the files are taken from where the
-/// process is. Returns an empty text when there is none, and has said why.
+/// expands to; top asks for those of the top level. Files below the current directory get relative
+/// names. Returns an empty text when there is none, and has said why.
 std::string make_command(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
                          la_command_options& options, bool top, const la_report& report);
 

@@ -44,8 +44,8 @@ struct LA_RUN {
   Port::FileStatus output_after;
 };
 
-/// What LA_LAUNCHER::find records on the way, for those who want to show it: what it saw and what
-/// it decided, in this order, where it saw and decided it. The rules belong to the launcher.
+/// What LA_LAUNCHER::find saw, decided and did, in the order in which it happened, for hosts that
+/// show it. The rules belong to the launcher.
 struct LA_EXPLANATION {
   /// A place where a file was looked for.
   enum SIGHTING {

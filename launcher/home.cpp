@@ -6,12 +6,13 @@ void la_home::settle() {
   char cwd[LA_MAX_PATH];
   Port::File::getcwd(cwd, sizeof cwd);
   if (is_sure_ && cwd_ == cwd) return;
+  is_sure_ = false;  // If memory runs out here, the next find tries again.
   cwd_ = cwd;
-  is_sure_ = true;
   dir_.set_dir(cwd);
   const char* name = dir_.get_dir();
   // A netlister may have put another directory in its place.
   prefix_ = name != nullptr && Port::File::same(name, ".") ? name : "";
+  is_sure_ = true;
 }
 
 const char* la_home::relative(const char* path) const {

@@ -16,9 +16,9 @@ class la_home {
   /// Forgets that its name leads to it: something has run that may have moved it.
   void doubt() { is_sure_ = false; }
 
-  /// The directory. It has no name when that is gone, too long, or holds a backslash.
+  /// The directory; empty when it is gone, or its name is too long or holds a backslash.
   const LA_DIR& dir() const { return dir_; }
-  /// path as it is best asked for while home is the current directory.
+  /// The shortest name for path while home is the current directory.
   const char* relative(const char* path) const;
   /// What is known of a file, asked for from home; path may be null.
   Port::FileStatus status(const char* path) const;

@@ -64,7 +64,7 @@ bool la_lookup::find_in_searchpaths(const char* ext, la_found_file& found) {
 }
 
 /// What is known of a file, unless a failed run has left it; path may be null. A file that is there
-/// is not noted here: what comes of it is the caller's to say.
+/// is for the caller to note, who knows what comes of it.
 Port::FileStatus la_lookup::look_at(const char* path) {
   const Port::FileStatus status = home_.status(path);
   if (!status.exists) {

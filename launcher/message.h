@@ -7,7 +7,7 @@
 /// The message manager, for one message from the line that calls this.
 Port_MsgManData& la_launcher_message(int line = __builtin_LINE());
 
-/// What every room of a find tells the user by, beside messages.
+/// What the rooms of a find report with, besides messages. The counts are the launcher's.
 struct la_report {
   bool detail;  ///< detail messages are wanted
   int& errors;

@@ -16,8 +16,7 @@ bool is_same_file(const Port::FileStatus& a, const Port::FileStatus& b) {
 }
 
 /// Whether something has written to a file, or put another one in its place. Its time of change
-/// says less: a netlister may have made a link to it. Whoever takes it away leaves nothing that
-/// could be stale.
+/// says less: a netlister may have made a link to it. One that is gone makes nothing stale.
 bool has_changed(const Port::FileStatus& before, const Port::FileStatus& after) {
   return after.exists &&
          (!is_same_file(before, after) || before.size != after.size || before.time != after.time);
@@ -53,13 +52,17 @@ bool la_netlister_runs::run(const LA_RULE& rule, const la_step_files& files, LA_
   if (only_announce) return true;
 
   home_.doubt();
-  const bool goes_on = execute(rule, result);
-  result.output_after = la_status_of(result.output.c_str());
-  if (goes_on && result.output_after.exists) {
-    mind_changes(inputs, files, result);
-  } else if (result.end != LA_RUN::NOT_STARTED) {
-    mark_stale(files, result.output_before);
+  bool goes_on = false;
+  try {
+    goes_on = execute(rule, result);
+  } catch (...) {
+    mark_stale(inputs, files, result.output_before);
+    throw;
   }
+  result.output_after = la_status_of(result.output.c_str());
+  if (!goes_on && result.end != LA_RUN::NOT_STARTED)
+    mark_stale(inputs, files, result.output_before);
+  if (goes_on && result.output_after.exists) mind_changes(inputs, files, result);
   return goes_on;
 }
 
@@ -99,7 +102,6 @@ bool la_netlister_runs::execute(const LA_RULE& rule, LA_RUN& result) const {
   return false;
 }
 
-/// The files that the step depends on: its input first.
 std::vector<LA_EXPLANATION::SEEN> la_netlister_runs::inputs_of(const LA_RULE& rule,
                                                                const la_step_files& files) const {
   std::vector<LA_EXPLANATION::SEEN> inputs;
@@ -109,9 +111,9 @@ std::vector<LA_EXPLANATION::SEEN> la_netlister_runs::inputs_of(const LA_RULE& ru
   return inputs;
 }
 
-/// Where a file that the step depends on was changed while the netlister ran, nobody knows what the
-/// netlister has read. The output gets the time stamp that the input had before, so that the next
-/// call makes it again.
+/// If a file that the step depends on was changed while the netlister ran, nobody knows which of
+/// its contents the netlister has read. The output gets the time stamp that the input had before,
+/// so that the next call makes it again.
 void la_netlister_runs::mind_changes(const std::vector<LA_EXPLANATION::SEEN>& before,
                                      const la_step_files& files, const LA_RUN& run) const {
   __int64 time = before.front().status.time;
@@ -139,7 +141,8 @@ void la_netlister_runs::mind_changes(const std::vector<LA_EXPLANATION::SEEN>& be
   }
 }
 
-void la_netlister_runs::mark_stale(const la_step_files& files, const Port::FileStatus& before) {
+void la_netlister_runs::mark_stale(const std::vector<LA_EXPLANATION::SEEN>& inputs,
+                                   const la_step_files& files, const Port::FileStatus& before) {
   directory_.leave();
   const char* output = files.output.get_fullfile();
   const char* tail = files.output.get_tail();
@@ -148,9 +151,10 @@ void la_netlister_runs::mark_stale(const la_step_files& files, const Port::FileS
   const Port::FileStatus status = la_status_of(file);
   if (!status.exists) return;
   // A link to what was read must not make that old.
-  const Port::FileStatus input = la_status_of(files.input.get_fullfile());
-  const bool is_link = is_same_file(status, input) ||
-                       is_same_file(status, la_status_of(files.source.get_fullfile()));
+  const bool is_link = is_same_file(status, la_status_of(files.source.get_fullfile())) ||
+                       std::any_of(inputs.begin(), inputs.end(), [&](const auto& input) {
+                         return is_same_file(status, la_status_of(input.path.c_str()));
+                       });
   if (!is_link && Port::File::setoldest(file)) {
     if (!report_.detail) return;
     la_launcher_message().issueStatus(
@@ -160,6 +164,7 @@ void la_netlister_runs::mark_stale(const la_step_files& files, const Port::FileS
   }
   // The time stamp of another user's file cannot be set. One that was not written, and will be
   // found out of date as it stands, need not be touched.
+  const Port::FileStatus input = la_status_of(files.input.get_fullfile());
   if (status == before && status.time < input.time) return;
   const bool is_removed = Port::File::remove(file);
   la_launcher_message().issueWarning(

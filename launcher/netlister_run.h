@@ -3,6 +3,8 @@
 #ifndef KESTREL_LAUNCHER_NETLISTER_RUN_H
 #define KESTREL_LAUNCHER_NETLISTER_RUN_H
 
+#include <vector>
+
 #include "file/baslafile.h"
 #include "host/port_file.h"
 #include "launcher/build_settings.h"
@@ -32,17 +34,19 @@ class la_netlister_runs {
   bool run(const LA_RULE& rule, const la_step_files& files, LA_RUN& result);
   /// What is known of a file, wherever the process is.
   Port::FileStatus ask(const char* path) const;
+  /// The files that the step depends on: its input first.
+  std::vector<LA_EXPLANATION::SEEN> inputs_of(const LA_RULE& rule,
+                                              const la_step_files& files) const;
   /// Sees to it that the output of a step that failed is never taken for up to date: gives it the
   /// oldest time stamp that there is. Its content stays for whoever wants to look into it. before:
   /// what was known of it before the run. Goes home for that.
-  void mark_stale(const la_step_files& files, const Port::FileStatus& before);
+  void mark_stale(const std::vector<LA_EXPLANATION::SEEN>& inputs, const la_step_files& files,
+                  const Port::FileStatus& before);
 
  private:
   bool execute(const LA_RULE& rule, LA_RUN& result) const;
   void mind_changes(const std::vector<LA_EXPLANATION::SEEN>& before, const la_step_files& files,
                     const LA_RUN& run) const;
-  std::vector<LA_EXPLANATION::SEEN> inputs_of(const LA_RULE& rule,
-                                              const la_step_files& files) const;
 
   const bool top_;
   la_home& home_;

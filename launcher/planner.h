@@ -21,8 +21,8 @@ struct la_plan {
   OUTCOME outcome = NOTHING;
   DARRAY_LA_RULE_CONST_PTR chain{3};  ///< in the order in which they run
   la_found_file source;               ///< what the first of them reads
-  /// The rules, by their numbers, that led to a rule that is among them already: each needs what
-  /// the next one makes, and the last is that rule.
+  /// The numbers of the rules on the way into the loop and around it: each needs what the next one
+  /// makes, and the last is one that has come before. Empty when there is no loop.
   std::vector<int> loop;
 };
 
@@ -31,8 +31,7 @@ using la_find_input = std::function<bool(const char* ext, la_found_file& found)>
 
 /// Looks for a chain that makes a file with the extension wanted, for netlists called name. For
 /// each rule, in the order of the set, a chain that produces its input is preferred to the input
-/// itself. considered may be null; else it gets the rules that were considered. plan is as it was
-/// made.
+/// itself. considered may be null; else it gets the rules that were considered. plan must be new.
 void plan_chain(const la_rule_index& rules, const char* name, const char* wanted,
                 const la_find_input& find_input,
                 std::vector<LA_EXPLANATION::CONSIDERED>* considered, la_plan& plan);

@@ -19,8 +19,8 @@ class la_working_directory {
   la_working_directory& operator=(const la_working_directory&) = delete;
   ~la_working_directory() { leave(); }
 
-  /// Goes where the rule wants its netlister to run. Where that cannot be entered, the process
-  /// stays where it is. In detail, tells where, and what the netlister will inherit.
+  /// Goes where the rule wants its netlister to run. If it cannot go there, the process stays
+  /// where it is. In detail, tells where, and what the netlister will inherit.
   void enter(const LA_RULE& rule, const LA_FULLFILE& input, const LA_FULLFILE& output,
              const la_report& report);
   /// Goes home.

@@ -139,9 +139,10 @@ d.kbc s/d.kbc s/e.kbc | -sd s d e.kbc | 0 ~/d.kbc ~/d.kbc, 0 ~/s/e.kbc ~/s/e.kbc
 d.kbo             | d.kbc e        | W Launcher: Could not find file ~/d with extension kbc in the search path. Ignoring extension., 1 W1, 1 W1
                   | "" x/          | E No base name given in netlist specification ""., -1 E1, E No base name given in netlist specification "x/"., -1 E2
                   | .kbo           | E No base name given in netlist specification ".kbo"., -1 E1
-RULES=t,u,v,w,x; t=top.edf,.kbo,,nl,,1,,,,0; u=.edf,.KBO,,nl,,2,,,,0; v=d.,.V,,nl,,$infile $outfile,,,,0; w=.v,.kbo,,nl,,$infile,,,,0; x=.sch,.v,,nl,,$infile,,,,0
+RULES=t,u,v,w,x,y; t=top.edf,.kbo,,nl,,1,,,,0; u=.edf,.KBO,,nl,,2,,,,0; v=d.,.V,,nl,,$infile $outfile,,,,0; w=.v,.kbo,,nl,,$infile,,,,0; x=.sch,.v,,nl,,$infile,,,,0; y=e..,.kbo,,nl,,$infile $outfile,,,,0
 d.edf TOP.edf     | -n d TOP       | run 2, 0 ~/d.edf ~/d.KBO, run 1, 0 ~/TOP.edf ~/TOP.kbo
 d.sch d           | -n d           | run "d" "d.V", run "d.V", 0 ~/d ~/d.kbo
+e.                | -n e..         | run "e." "e.kbo", 0 ~/e. ~/e.kbo
 )");
 }
 
