@@ -118,7 +118,8 @@ int console::count(Port_MsgLevel level) {
 }
 
 bool console::is_terminal() {
-  return ::isatty(STDERR_FILENO) != 0;
+  static const bool is_terminal = ::isatty(STDERR_FILENO) != 0;
+  return is_terminal;
 }
 
 void console::show(void* self, const Port_Msg& message) {

@@ -36,6 +36,10 @@ a.b.c          | ~/w/a.b.c/ ; - a.b c a.b a.b.c a.b.c ; ~/w/ ~/w/a.b ~/w/a.b.c "
 ~/w/s/./x      | ~/w/s/./x/ ; - - - - - - ; ~/w/s/./ ~/w/s/./x ~/w/s/x "s/x")");
   EXPECT_EQ(getters("") + getters("///a/x"), replaced("()()", "()", "- ; - - - - - - ; - - - -"));
   EXPECT_EQ(tree.shorten(shown({LA_DIR(nullptr).get_dir(), LA_FILE().get_file()})), "~/w/ -");
+  Port::File::chdir("/");
+  const LA_FULLFILE top("x");
+  EXPECT_EQ(shown({LA_DIR(nullptr).get_dir(), top.get_fullfile(), top.get_external_path()}),
+            "/ /x \"x\"");
 }
 
 TEST_F(Names, Setters) {
@@ -51,7 +55,10 @@ TEST_F(Names, Setters) {
       {"0 - ~/x/", [](Full& f) { return f.set_file(f.get_name(), nullptr); }},
       {"1 ~/d/t/x ~/d/t/", [](Full& f) { return f.set_file("d", "t/x"); }},
       {"0 - -", [](Full& f) { return f.set_file("", "x"); }},
-      {"0 - /d/", [](Full& f) { return f.set_file(LA_DIR("/d"), "t/"); }}};
+      {"0 ~/s/x ~/s/", [](Full& f) { return f.set_ext(nullptr); }},
+      {"1 ~/s/x.k ~/s/", [](Full& f) { return f.set_ext("k"); }},
+      {"1 /d/t/x /d/t/", [](Full& f) { return f.set_file(LA_DIR("/d"), "t/x"); }},
+      {"1 /d/b.c /d/", [](Full& f) { return f.set_file(LA_DIR("/d"), "t/") + f.set_tail("b.c"); }}};
   for (const auto& [expected, set] : rows) {
     Full f("s/x.e");
     const std::string result = std::to_string(set(f)) + " ";
@@ -64,7 +71,8 @@ TEST_F(Names, MatchesAndFiles) {
   const LA_FULLFILE file("s/../s/x.e");
   EXPECT_TRUE(file.match_name("X") && file.match_ext("E") && file.match_tail("X.E"));
   EXPECT_TRUE(file.match_dir(tree.home.c_str()) && file.match_fullfile(tree.full("S/X.E").c_str()));
-  EXPECT_FALSE(file.match_ext(".e") || file.match_fullfile(tree.full("./s/x.e").c_str()));
+  EXPECT_FALSE(file.match_ext(".e") || file.match_dir("/s") ||
+               file.match_fullfile(tree.full("./s/x.e").c_str()));
   __int64 time = 7;
   for (const char* name : {"s/d.e", "s/y.e", "s/x.e/z", "s/"}) {
     EXPECT_FALSE(LA_FILE(name).exists() || LA_FULLFILE(name).get_timestamp(time)) << name;
@@ -108,8 +116,10 @@ TEST_F(Names, TooLongIsRefusedWhole) {
     const LA_DIR joined(many(left - 2 + over).c_str());
     const LA_FULLFILE full(many(left - 1 + over).c_str());
     const LA_FULLFILE quoted(("/" + many(256 + over)).c_str());
+    LA_FULLFILE changed("/old");
+    changed.set_tail(many(259 + over).c_str());
     for (const char* name : {file.get_tail(), dir.get_dir(), joined.get_dir(), full.get_fullfile(),
-                             quoted.get_external_path()}) {
+                             quoted.get_external_path(), changed.get_name()}) {
       EXPECT_EQ(shown({name}).size(), over == 0 ? 259U : 1U);
     }
   }

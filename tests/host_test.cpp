@@ -35,6 +35,34 @@ TEST_F(Host, StringsAndArrays) {
   EXPECT_TRUE(*static_cast<char**>(array.getaddr(9)) == nullptr && array.elements[0] == nullptr);
 }
 
+TEST_F(Host, SortedArrays) {
+  struct Sorted : DARRAY_NAME {
+    Sorted() : DARRAY_NAME(2) {
+      char letters[] = "dacb";
+      for (char* letter = letters; *letter != 'b'; ++letter) a_sortadd(&letter, compare);
+      char* const c = elements[1];
+      char* b = letters + 3;
+      EXPECT_EQ(all() + std::to_string(a_bsearch(&c, compare)), "acd1");
+      EXPECT_TRUE(a_bsearch(&b, compare) == -1 && intgetindex(c) == 1 && intgetindex(b) == -1);
+      a_shift(1, 2);
+      EXPECT_TRUE(count == 5 && elements[1] == nullptr && elements[2] == nullptr);
+      elements[1] = elements[2] = b;
+      a_shift(2, -1);
+      std::swap(elements[0], elements[3]);
+      a_sort(compare, 1, 3);
+      EXPECT_EQ(all(), "dabc");
+    }
+    std::string all() const {
+      std::string text;
+      for (const char* letter : *this) text += *letter;
+      return text;
+    }
+    static int compare(const void* a, const void* b) {
+      return **static_cast<char* const*>(a) - **static_cast<char* const*>(b);
+    }
+  } sorted;
+}
+
 // A cell is delimiters, then a line; the result is token, delimiter and rest, between "/".
 TEST_F(Host, Tokens) {
   const auto token_of = [](const std::string& cell) {

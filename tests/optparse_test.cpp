@@ -70,6 +70,7 @@ TEST(Templates, LimitsAndDump) {
   EXPECT_EQ(keywords.expanded(longest, 300), "<" + longest + ">");
   EXPECT_EQ(keywords.expanded("$long      $lead", 264), "<" + longest + " v  >");
   const std::string said = keywords.expanded(text, 518) + keywords.expanded(longest + "y", 1000);
+  EXPECT_NE(keywords.expanded("$long$long", 300).find("is longer than 299 ch"), said.npos);
   EXPECT_NE(said.find("of option string \"" + text + "\" is longer than 517 ch"), said.npos);
   EXPECT_NE(said.find("Option string \"" + longest + "y\" is longer than 259 ch"), said.npos);
   keywords.set_keyword("libraries", "c");
