@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
+#include <new>
 #include <utility>
 
 #include "host/base/utf8.h"
@@ -70,7 +71,12 @@ bool write_all(std::string_view text) {
 void add(int its_descriptor, std::string_view text) {
   if (descriptor != its_descriptor) console::flush();
   descriptor = its_descriptor;
-  waiting += text;
+  try {
+    waiting += text;
+  } catch (const std::bad_alloc&) {
+    console::flush();
+    write_all(text);
+  }
   if (waiting.size() >= BLOCK) console::flush();
 }
 

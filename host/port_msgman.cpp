@@ -1,7 +1,9 @@
 #include "host/port_msgman.h"
 
 #include <cstdio>
+#include <new>
 #include <string>
+#include <string_view>
 
 #include "host/cvnform.h"
 
@@ -9,10 +11,8 @@ namespace {
 
 void write_to_stderr(void* /*context*/, const Port_Msg& message) {
   static constexpr const char* PREFIXES[] = {"", "INFO: ", "WARNING: ", "ERROR: ", "DEBUG: "};
-  std::string text = PREFIXES[message.level];
-  text += message.text;
-  if (!text.ends_with('\n')) text += '\n';
-  std::fwrite(text.data(), 1, text.size(), stderr);
+  const bool has_end = std::string_view(message.text).ends_with('\n');
+  std::fprintf(stderr, "%s%s%s", PREFIXES[message.level], message.text, has_end ? "" : "\n");
 }
 
 constexpr Port_MsgSink START_SINK = {write_to_stderr, nullptr, false};
@@ -54,7 +54,14 @@ Port_MsgManData& Port_MsgManData::createObject(const char* program, const char* 
 }
 
 void Port_MsgManData::issue(Port_MsgLevel level, const char* format, va_list arguments) const {
-  hand_on(level, format_text(format, arguments).c_str());
+  std::string text;
+  const char* shown = format;  // Without memory, that says more than nothing.
+  try {
+    text = format_text(format, arguments);
+    shown = text.c_str();
+  } catch (const std::bad_alloc&) {
+  }
+  hand_on(level, shown);
 }
 
 void Port_MsgManData::hand_on(Port_MsgLevel level, const char* text) const {

@@ -56,7 +56,8 @@ int UT_DARRAY::a_bsearch(const void* key, Compare compare) {
 }
 
 void UT_DARRAY::a_resetnum(int new_count) {
-  if (storage_.empty()) reserve(static_cast<std::uint64_t>(std::max(step_, 1)));
+  // Never to empty it: that is for destructors, too.
+  if (new_count > 0 && storage_.empty()) reserve(static_cast<std::uint64_t>(std::max(step_, 1)));
   storage_.resize(static_cast<std::size_t>(bytes(new_count)));
   publish();
 }
