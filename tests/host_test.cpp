@@ -1,9 +1,12 @@
 // The services of the host layer.
+#include <fcntl.h>
+#include <poll.h>
 #include <signal.h>
 #include <unistd.h>
 
 #include <filesystem>
 
+#include "host/base/line_cutter.h"
 #include "host/base/utf8.h"
 #include "host/pm_devkey.h"
 #include "host/port_file.h"
@@ -12,6 +15,18 @@
 #include "host/static_acd.h"
 #include "host/ut_darray.h"
 #include "support.h"
+
+static bool poll_fails = false;
+// NOLINTBEGIN(bugprone-reserved-identifier): The linker gives these names.
+extern "C" {
+int __real_poll(pollfd* events, nfds_t count, int timeout);
+int __wrap_poll(pollfd* events, nfds_t count, int timeout) {
+  if (!poll_fails) return __real_poll(events, count, timeout);
+  errno = EIO;
+  return -1;
+}
+}
+// NOLINTEND(bugprone-reserved-identifier)
 
 struct Host : testing::Test {
   Tree tree;
@@ -81,7 +96,13 @@ TEST_F(Host, Tokens) {
 
 TEST_F(Host, LinesAcrossBlocks) {
   const std::string block(16384, 'x');
-  const std::string lines[] = {block.substr(4), "", "\xEF\xBB\xBF\r", block + block, "a\r"};
+  const std::string lines[] = {block.substr(4),
+                               block.substr(0, LA_MAX_PATH - 1),
+                               block.substr(0, LA_MAX_PATH),
+                               "",
+                               "\xEF\xBB\xBF\r",
+                               block + block,
+                               "a\r"};
   tree.write("f", "\xEF\xBB\xBF");
   for (const auto& l : lines) tree.write("f", tree.read("f") + l + (l == "a\r" ? "" : "\r\n"));
   const std::unique_ptr<Port::Stream> stream(Port::File::open("f", Port::Stream::READ, true));
@@ -91,6 +112,17 @@ TEST_F(Host, LinesAcrossBlocks) {
     EXPECT_EQ(buffer, line.substr(0, LA_MAX_PATH - 1));
   }
   EXPECT_TRUE(stream->geteof() && !stream->failed());
+}
+
+TEST_F(Host, CurrentDirectory) {
+  const auto named = [](std::size_t size) {
+    char buffer[LA_MAX_PATH];
+    Port::File::getcwd(buffer, static_cast<short>(size));
+    return std::string(buffer);
+  };
+  EXPECT_EQ(named(tree.home.size() + 1) + named(tree.home.size()), tree.home);
+  EXPECT_TRUE(Port::File::chdir("/"));
+  EXPECT_EQ(named(2) + named(1), "/");
 }
 
 TEST_F(Host, TimeStamps) {
@@ -120,6 +152,10 @@ TEST_F(Host, Messages) {
   }
   Port_MsgSink quiet = Port_MsgManData::setSink({nullptr, nullptr, false});
   quiet.debug = false;
+  testing::internal::CaptureStderr();
+  Port_MsgManData::createObject("Kestrel", "f.cpp", 1, "r1").issueInfo("a\n");
+  Port_MsgManData::createObject("Kestrel", "f.cpp", 1, "r1").issueStatus("b");
+  EXPECT_EQ(testing::internal::GetCapturedStderr(), "INFO: a\nb\n");
   EXPECT_NE(Port_MsgManData::setSink(quiet).function, nullptr);
   Port_MsgManData::debugStub("nobody asked");
   Port_MsgManData::createObject("Kestrel", "f.cpp", 1, "r1").issueWarning("100%");
@@ -225,18 +261,46 @@ printf a\x00b\n\x00            | 0: a␀b\n/␀/
 x "y                           | x "y: a quote is without its partner
 x 'y                           | x 'y: a quote is without its partner)");
   EXPECT_EQ(ran("") + ran(" $ say=a"), ran("''") + ran("''"));
+  // Whichever of the standard streams this process has.
+  for (int closed = 0; closed < 8; ++closed) {
+    int kept[3];
+    for (int i = 0; i < 3; ++i) {
+      kept[i] = ::fcntl(i, F_DUPFD_CLOEXEC, 10);
+      if ((closed >> i & 1) != 0) ::close(i);
+    }
+    const std::string said = ran("$ say=a err=b");
+    for (int i = 0; i < 3; ++i) ::dup2(kept[i], i), ::close(kept[i]);
+    EXPECT_EQ(said, "0: a\n/b\n/") << closed;
+  }
+  poll_fails = true;
+  EXPECT_EQ(ran("printf %0131072d 0"), "printf: its output could not be read: Input/output error");
+  poll_fails = false;
   EXPECT_EQ(descriptors(), before);
   for (const int number : {SIGCHLD, SIGTERM}) ::signal(number, SIG_DFL);
 }
 
+// A piece is as long as it may be, but for a character that it would cut.
 TEST_F(Host, LongLinesInPieces) {
-  const std::string piece(65536, '0');
-  const std::string pieces = piece + "/" + piece + "\n/" + piece + "/0/";
-  EXPECT_EQ(ran("printf %0131072d\\n%065537d 0 0"), "0: " + pieces);
-  for (const std::size_t kept :
-       {65533u, 65534u, 65535u}) {  // With room for 3, 2, 1 bytes of three.
-    const std::string zeros(kept, '0');
-    EXPECT_EQ(ran("printf %0" + std::to_string(kept) + "d\\342\\202\\254\\n 0"),
-              "0: " + zeros + (kept > 65533 ? "/" : "") + "\u20ac\n/");
+  constexpr std::size_t LONGEST = la_line_cutter::LONGEST;
+  for (const std::string character : {"0", "\u07FF", "\u20AC", "\U0001F600"}) {
+    for (std::size_t before = LONGEST - 5; before <= LONGEST + 1; ++before) {
+      for (const std::string end : {"", "\n", "xyz\n"}) {
+        std::string rest = std::string(before, '0') + character + end + "next\n",
+                    block = rest + "?";
+        std::vector<std::string> pieces, expected;
+        la_line_cutter cutter([&](const char* piece) { pieces.emplace_back(piece); });
+        for (std::size_t at = 0; at < rest.size(); at += 40'000)
+          cutter.add(block.data() + at, std::min<std::size_t>(40'000, rest.size() - at));
+        cutter.flush();
+        while (!rest.empty()) {
+          std::size_t length = std::min(LONGEST, rest.find('\n'));
+          while ((rest[length] & 0xC0) == 0x80) --length;
+          if (rest[length] == '\n') ++length;
+          expected.push_back(rest.substr(0, length));
+          rest.erase(0, length);
+        }
+        EXPECT_TRUE(pieces == expected) << before << character << end;
+      }
+    }
   }
 }

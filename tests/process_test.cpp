@@ -20,6 +20,30 @@
 
 namespace fs = std::filesystem;
 
+namespace failing_memory {
+long left = -1;      ///< allocations that succeed before one fails; -1 for all
+bool lasts = false;  ///< those after it fail, too
+bool has_failed = false;
+}  // namespace failing_memory
+
+// Out of line: g++ takes free for a mismatch where it sees it inlined.
+[[gnu::noinline]] void* operator new(std::size_t size) {
+  using namespace failing_memory;
+  if (left == 0) {
+    has_failed = true;
+    if (!lasts) left = -1;
+    throw std::bad_alloc();
+  }
+  if (left > 0) --left;
+  return std::malloc(size);
+}
+[[gnu::noinline]] void operator delete(void* memory) noexcept {
+  std::free(memory);
+}
+[[gnu::noinline]] void operator delete(void* memory, std::size_t) noexcept {
+  std::free(memory);
+}
+
 namespace {
 
 /// What a guest must leave as it is.
@@ -102,6 +126,75 @@ TEST_F(Guest, LeavesItsProcessAsItWas) {
     ::sigprocmask(SIG_SETMASK, &before, nullptr);
     for (const int number : {SIGCHLD, SIGUSR1, SIGPIPE}) ::signal(number, SIG_DFL);
   }
+}
+
+// A child of the host's own ends while a netlister runs: is it left to be reaped, how often was the
+// handler called, is the signal pending?
+TEST_F(Guest, LeavesTheHostItsChildren) {
+  static int calls;
+  const auto handler = [](int) { ++calls; };
+  struct {
+    void (*action)(int);
+    int flags, how;
+    const char* left;
+  } const rows[] = {{SIG_DFL, 0, SIG_UNBLOCK, "100"},          {SIG_DFL, 0, SIG_BLOCK, "101"},
+                    {SIG_IGN, 0, SIG_UNBLOCK, "000"},          {handler, 0, SIG_UNBLOCK, "110"},
+                    {SIG_DFL, SA_NOCLDWAIT, SIG_BLOCK, "001"}, {handler, 0, SIG_BLOCK, "101"}};
+  sigset_t signals, pending;
+  ::sigemptyset(&signals);
+  ::sigaddset(&signals, SIGCHLD);
+  for (const auto& [action, flags, how, left] : rows) {
+    struct sigaction now = {};
+    now.sa_handler = action;
+    now.sa_flags = flags;
+    ::sigaction(SIGCHLD, &now, nullptr);
+    ::sigprocmask(how, &signals, nullptr);
+    calls = 0;
+    if (::fork() == 0) ::usleep(10'000), ::_exit(0);
+    find("d", "sleep=100");
+    ::sigpending(&pending);
+    const int is_left = ::waitpid(-1, nullptr, WNOHANG) > 0;
+    EXPECT_EQ(std::to_string(is_left) + std::to_string(calls > 0) +
+                  std::to_string(::sigismember(&pending, SIGCHLD)),
+              left);
+    ::signal(SIGCHLD, SIG_DFL);
+    ::sigprocmask(SIG_UNBLOCK, &signals, nullptr);
+  }
+}
+
+TEST_F(Guest, BearsThatMemoryRunsOut) {
+  int errors = 0;
+  const auto count = [](void* sum, const Port_Msg& message) {
+    *static_cast<int*>(sum) += message.level == PORT_MSG_ERROR;
+  };
+  const Port_MsgSink before = Port_MsgManData::setSink({count, &errors, false});
+  const char* words[] = {"say=a"};
+  for (failing_memory::lasts = false;; failing_memory::lasts = true) {
+    for (long number = 0; number == 0 || failing_memory::has_failed; number += 1 + number / 20) {
+      char source[LA_MAX_PATH], netlist[LA_MAX_PATH];
+      errors = 0;
+      failing_memory::has_failed = false;
+      failing_memory::left = number;
+      LA_LAUNCHER launcher("hx", words, 1, words, 1, "", nullptr, 1, 0, 1, 1, 1, 1);
+      launcher.add_searchpaths(words, 1);
+      short result = LA_FAILED;
+      if (errors == 0) result = launcher.find("d", source, netlist, 0);
+      failing_memory::left = -1;
+      EXPECT_EQ(result == LA_FOUND, errors == 0) << number;
+      EXPECT_EQ(::waitpid(-1, nullptr, WNOHANG), -1) << number;
+    }
+    if (failing_memory::lasts) break;
+  }
+  Port_MsgManData::setSink(before);
+}
+
+// Each netlister tells how many children its parent has, and leaves one to it that ends.
+TEST_F(Guest, ACommandReapsWhatNetlistersLeave) {
+  tree.remove("bin/nl");
+  tree.write("bin/nl",
+             "#!/bin/sh\nPATH=/bin\nwc -w </proc/$PPID/task/$PPID/children; (true &); sleep 0.1");
+  ::chmod("bin/nl", 0700);
+  EXPECT_EQ(tree.shell("kestrel-launch -f d d 2>&1 | /bin/grep '^[0-9]'"), "1\n2\n1\n2\n");
 }
 
 TEST_F(Guest, FailsCleanlyWithoutDescriptors) {
