@@ -194,7 +194,9 @@ TEST_F(Guest, ACommandReapsWhatNetlistersLeave) {
   tree.write("bin/nl",
              "#!/bin/sh\nPATH=/bin\nwc -w </proc/$PPID/task/$PPID/children; (true &); sleep 0.1");
   ::chmod("bin/nl", 0700);
-  EXPECT_EQ(tree.shell("kestrel-launch -f d d 2>&1 | /bin/grep '^[0-9]'"), "1\n2\n1\n2\n");
+  const std::string command = KESTREL_LAUNCH;
+  const Ran ran = run({"/bin/sh", "-c", command + " -f d d 2>&1 | /bin/grep '^[0-9]'"});
+  EXPECT_EQ(ran.out, "1\n2\n1\n2\n");
 }
 
 TEST_F(Guest, FailsCleanlyWithoutDescriptors) {
