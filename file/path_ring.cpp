@@ -1,7 +1,5 @@
 #include "file/path_ring.h"
 
-#include <cstring>
-
 #include "host/ut_path.h"
 
 static constexpr int RING_SIZE = 100;
@@ -16,6 +14,6 @@ const char* la_in_ring(const la_path_text& text, int slots) {
     slot[0] = '\0';
     la_path_ring_next = (la_path_ring_next + 1) % RING_SIZE;
   }
-  std::memcpy(slot, text.chars(), text.length() + 1);
+  UT_STR::Copy(slot, text.chars());
   return UT_PATH::ExternalPath(slot);
 }
