@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <new>
 #include <utility>
 
@@ -132,7 +133,7 @@ void console::show(void* self, const Port_Msg& message) {
   const auto& [flushes, colour, before] = *static_cast<console*>(self);
   ++counts[message.level];
   if (message.program == OURSELVES) {
-    complain(message.text);
+    complain(std::string(message.text, std::strlen(message.text) - 1));
     return;
   }
   const appearance look = appearance_of(message.level);
@@ -174,7 +175,7 @@ void complain(Port_MsgLevel level, const std::string& text) {
       Port_MsgManData::createObject(OURSELVES, "cli/console.cpp", __LINE__, "");
   const auto issue =
       level == PORT_MSG_ERROR ? &Port_MsgManData::issueError : &Port_MsgManData::issueWarning;
-  (message.*issue)("%s", text.c_str());
+  (message.*issue)("%s\n", text.c_str());
 }
 
 std::string json_string(std::string_view text) {

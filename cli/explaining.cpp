@@ -1,14 +1,18 @@
 // Explaining what would be done for names.
 #include <string>
 
+#include "cli/conflicts.h"
 #include "cli/console.h"
 #include "cli/explain.h"
 #include "cli/launching.h"
+#include "cli/loading.h"
 #include "cli/tasks.h"
 #include "launcher/baslauncher.h"
 
 int explain(const settings& set) {
   LA_LAUNCHER launcher = launcher_of(set);
+  tell_of_loading(launcher.rule_set(), set, PORT_MSG_WARNING);
+  conflicts between_names(launcher);
   int status = launcher.ok ? ALL_FOUND : FAILED;
   std::string error;
   // The explanation says what the messages say, and the errors are its answers.
@@ -23,6 +27,7 @@ int explain(const settings& set) {
     char source[LA_MAX_PATH];
     char netlist[LA_MAX_PATH];
     error.clear();
+    between_names.begin(set.names[i]);
     const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
     console::print(explained({set.names[i], result, netlist, error}, why));
     console::flush();

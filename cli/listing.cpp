@@ -4,8 +4,8 @@
 #include "cli/completion.h"
 #include "cli/console.h"
 #include "cli/graph.h"
+#include "cli/loading.h"
 #include "cli/place.h"
-#include "cli/roots.h"
 #include "cli/settings.h"
 #include "cli/tasks.h"
 #include "host/pm_pic.h"
@@ -28,7 +28,7 @@ std::string rest_of(const LA_RULE& rule, const place_names& places, bool detail)
 
 int list_rules(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
-  tell_if_empty(rules);
+  tell_of_loading(&rules, set, PORT_MSG_WARNING);
   const diversion to_output([](const Port_Msg& message) {
     const bool is_listed = message.level == PORT_MSG_STATUS;
     if (is_listed) console::print(message.text);
@@ -45,12 +45,13 @@ int list_rules(const settings& set) {
 
 int draw_graph(const settings& set) {
   const LA_RULE_SET rules(set.part, set.user_rules);
-  tell_if_empty(rules);
+  tell_of_loading(&rules, set, PORT_MSG_WARNING);
   if (rules.is_valid) console::print(graph_of(rules));
   return rules.is_valid ? ALL_FOUND : FAILED;
 }
 
 int list_parts(const settings& /*set*/) {
+  tell_of_device_tables();
   bool good = true;
   const diversion noting([&good](const Port_Msg& message) {
     good = good && message.level != PORT_MSG_ERROR;

@@ -1,14 +1,18 @@
 // Resolving names.
-#include <algorithm>
+#include <chrono>
 #include <cstdlib>
 #include <filesystem>
 #include <string>
 #include <system_error>
 #include <vector>
 
+#include "cli/conflicts.h"
 #include "cli/console.h"
 #include "cli/launching.h"
+#include "cli/loading.h"
+#include "cli/not_found.h"
 #include "cli/results.h"
+#include "cli/runs.h"
 #include "cli/signals.h"
 #include "cli/tasks.h"
 #include "host/port_file.h"
@@ -22,19 +26,18 @@ bool is_dry_run() {
   return std::getenv("LA_TEST") != nullptr;
 }
 
-/// Whether netlisters that say that they have done their work have written the file to read.
-bool is_written(const resolution& found) {
-  const char* netlist = found.netlist.c_str();
-  const Port::FileStatus status = Port::File::status(netlist);
-  if (!status.exists) {
-    complain(PORT_MSG_ERROR, Port::File::isdirectory(netlist)
-                                 ? found.netlist + " is a directory"
-                                 : "no netlister has written " + found.netlist);
-  } else if (status.time < Port::File::status(found.source.c_str()).time) {
-    complain(PORT_MSG_WARNING,
-             found.netlist + " is older than its source: the next call makes it again");
-  }
-  return status.exists;
+/// Says so when the file to read, which is there, is older than its source.
+void tell_if_older(const resolution& found) {
+  const __int64 time = Port::File::status(found.netlist.c_str()).time;
+  if (time >= Port::File::status(found.source.c_str()).time) return;
+  complain(PORT_MSG_WARNING,
+           found.netlist + " is older than its source: the next call makes it again");
+}
+
+/// What the clock says, in nanoseconds since 1970.
+__int64 now() {
+  const auto time = std::chrono::system_clock::now().time_since_epoch();
+  return std::chrono::duration_cast<std::chrono::nanoseconds>(time).count();
 }
 
 /// A name as it is seen from everywhere. Without rules, the library leaves relative ones as they
@@ -59,20 +62,18 @@ resolution resolved(LA_LAUNCHER& launcher, const std::string& name, bool top) {
   });
   char source[LA_MAX_PATH];
   char netlist[LA_MAX_PATH];
-  const int runs_before = launcher.runs;
+  const __int64 start = now();
   found.result = launcher.find(name.c_str(), source, netlist, top);
   reap_orphans();
-  found.is_built = launcher.runs > runs_before;
+  const bool is_all_written = tell_of_runs(name, launcher.last_runs(), start);
+  if (found.result != LA_FOUND || !is_all_written) {
+    if (found.result == LA_FOUND) found.result = LA_FAILED;
+    return found;
+  }
+  found.is_built = !launcher.last_runs().empty();
   found.source = source;
   found.netlist = full_name(netlist);
-  if (found.result == LA_FOUND && !launcher.saw_netlist() && !is_dry_run() && !is_written(found)) {
-    found.result = LA_FAILED;
-  }
-  if (found.result == LA_FAILED) {
-    found.source.clear();
-    found.netlist.clear();
-    found.is_built = false;
-  }
+  if (!launcher.saw_netlist() && !is_dry_run()) tell_if_older(found);
   return found;
 }
 
@@ -90,18 +91,22 @@ int resolve(const settings& set) {
   LA_LAUNCHER launcher = launcher_of(set);
   int status = launcher.ok ? ALL_FOUND : FAILED;
   tally counted;
+  not_found missing(launcher.rule_set(), set.search_dirs);
+  conflicts between_names(launcher);
   const signal_handling while_it_resolves;
   const auto goes_on = [] {
     return Port_Interrupt::Requested() == 0 && !console::has_lost_results();
   };
   for (std::size_t i = 0; launcher.ok && i < set.names.size() && goes_on(); ++i) {
     show_progress(i, set.names);
+    between_names.begin(set.names[i]);
     const resolution found = resolved(launcher, set.names[i], set.top);
     print_result(set, found);
-    if (found.result == LA_NOT_FOUND) complain("not found: " + found.name);
+    if (found.result == LA_NOT_FOUND) missing.tell(found.name);
     counted.add(found);
     status = worse(status, found.result);
   }
+  if (status != ALL_FOUND) tell_of_loading(launcher.rule_set(), set, PORT_MSG_WARNING);
   counted.tell(set.names.size(), is_dry_run());
   if (set.json) print_totals(launcher.ok);
   // While signals are still handled: whoever reads may have left.

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <set>
 #include <string_view>
 
 #include "cli/nearest.h"
@@ -67,10 +68,9 @@ constexpr option OPTIONS[] = {
 };
 
 std::string unknown_option(const std::string& name) {
-  std::vector<const char*> names;
-  for (const option& o : OPTIONS) names.push_back(o.long_name);
-  const std::string meant = nearest(name, names);
-  return "unknown option " + name + (meant.empty() ? "" : "; did you mean " + meant + "?");
+  std::set<std::string> names;
+  for (const option& o : OPTIONS) names.insert(o.long_name);
+  return "unknown option " + name + did_you_mean(nearest_few(name, names));
 }
 
 /// One command line on its way into settings.

@@ -215,14 +215,14 @@ void LA_LAUNCHER::explain_to(LA_EXPLANATION* to) {
   if (finding) finding->why = to;
 }
 
-void LA_LAUNCHER::ask_before_chains(unsigned char (*may_build)(void* context, const char* source,
-                                                               const char* netlist),
+void LA_LAUNCHER::ask_before_chains(unsigned char (*may_build)(void* context,
+                                                               const char* const* files, int count),
                                     void* context) {
   if (!finding) return;
   finding->ask_host = nullptr;
   if (may_build == nullptr) return;
-  finding->ask_host = [may_build, context](const char* source, const char* netlist) {
-    return may_build(context, source, netlist) != 0;
+  finding->ask_host = [may_build, context](const std::vector<const char*>& files) {
+    return may_build(context, files.data(), static_cast<int>(files.size())) != 0;
   };
 }
 

@@ -85,12 +85,13 @@ class LA_LAUNCHER {
   void explain_to(LA_EXPLANATION* to);
   /// The rules, which live as long as the launcher; null if memory ran out in the constructor.
   const LA_RULE_SET* rule_set() const { return rules.get(); }
-  /// From now on find asks, before it looks at the first step of a chain, whether the chain that
-  /// leads from source to netlist, both full names, may be carried out. When the answer is 0,
-  /// nothing is run, and find returns LA_FAILED; the host tells its user why. context is handed on;
-  /// null for may_build ends that. It must not call the launcher.
-  void ask_before_chains(unsigned char (*may_build)(void* context, const char* source,
-                                                    const char* netlist),
+  /// From now on find asks, before it looks at the first step of a chain, whether the chain may be
+  /// carried out. files are full names: the source, then what each step makes of the one before it,
+  /// last the netlist. When the answer is 0, nothing is run, and find returns LA_FAILED; the host
+  /// tells its user why. context is handed on; null for may_build ends that. It must not call the
+  /// launcher.
+  void ask_before_chains(unsigned char (*may_build)(void* context, const char* const* files,
+                                                    int count),
                          void* context);
 
   /// 1 when the rules were loaded and passed their checks.

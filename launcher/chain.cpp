@@ -168,6 +168,21 @@ class chain_build {
   std::vector<LA_RUN> runs_;
 };
 
+/// Whether the host agrees. It is not asked about a chain that has a file without a full name, and
+/// fails there.
+bool may_build(const la_found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
+               chain_build& build, const la_ask_host& ask_host) {
+  std::vector<std::string> names = {source.file.get_fullfile()};
+  for (const LA_RULE* rule : chain) {
+    const char* output = build.output_of(*rule);
+    if (output == nullptr) return true;
+    names.emplace_back(output);
+  }
+  std::vector<const char*> files;
+  for (const std::string& name : names) files.push_back(name.c_str());
+  return ask_host(files);
+}
+
 }  // namespace
 
 la_built_chain build_chain(const la_found_file& source, const DARRAY_LA_RULE_CONST_PTR& chain,
@@ -175,12 +190,9 @@ la_built_chain build_chain(const la_found_file& source, const DARRAY_LA_RULE_CON
                            const la_ask_host& ask_host, const la_report& report,
                            LA_EXPLANATION* why) {
   chain_build build(source, top, settings, home, report, why);
-  if (ask_host) {
-    const char* netlist = build.output_of(*chain.elements[chain.count - 1]);
-    if (netlist != nullptr && !ask_host(source.file.get_fullfile(), netlist)) {
-      ++report.errors;
-      return build.finish(false);
-    }
+  if (ask_host && !may_build(source, chain, build, ask_host)) {
+    ++report.errors;
+    return build.finish(false);
   }
   const bool is_complete = std::all_of(chain.begin(), chain.end(),
                                        [&](const LA_RULE* rule) { return build.step(*rule); });

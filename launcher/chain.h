@@ -20,8 +20,8 @@ struct la_built_chain {
   std::vector<LA_RUN> runs;  ///< the netlisters that were announced
 };
 
-/// Asks the host whether a chain that leads from source to netlist may be carried out.
-using la_ask_host = std::function<bool(const char* source, const char* netlist)>;
+/// Asks the host whether a chain may be carried out: its source, then what each step makes.
+using la_ask_host = std::function<bool(const std::vector<const char*>& files)>;
 
 /// Decides each step of the chain, and runs the netlisters that are due. home is the current
 /// directory, before and after. ask_host may be empty. why may be null; else it gets every step.

@@ -1,0 +1,35 @@
+// Names of one call that would make one file from different ones.
+#ifndef KESTREL_CLI_CONFLICTS_H
+#define KESTREL_CLI_CONFLICTS_H
+
+#include <map>
+#include <string>
+
+#include "launcher/baslauncher.h"
+
+/// Lets no chain of a launcher make a file that an earlier chain has made from another one, and
+/// says so as an error.
+class conflicts {
+ public:
+  /// The launcher must outlive this object.
+  explicit conflicts(LA_LAUNCHER& launcher);
+  conflicts(const conflicts&) = delete;
+  conflicts& operator=(const conflicts&) = delete;
+  ~conflicts();
+
+  /// Whose chains come from now on.
+  void begin(const std::string& name) { name_ = name; }
+
+ private:
+  static unsigned char may_build(void* self, const char* const* files, int count);
+
+  struct origin {
+    std::string input;
+    std::string name;
+  };
+  LA_LAUNCHER& launcher_;
+  std::string name_;
+  std::map<std::string, origin> origins_;  ///< of what has been made
+};
+
+#endif
