@@ -6,6 +6,7 @@
 LA_FULLROOT::LA_FULLROOT(const LA_DIR& directory) : directory_(directory) {
   if (directory.dir == nullptr) return;
   normal_directory_ = directory.full_name();
+  if (!normal_directory_.fits()) return;
   directory_length_ = normal_directory_.length();
   la_normalise(normal_directory_);
 }
