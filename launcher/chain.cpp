@@ -141,12 +141,16 @@ class chain_build {
     // What a netlister that was started has left is dealt with already.
     const LA_RUN& last = runs_.back();
     if (last.rule == rule_ && last.end != LA_RUN::NOT_STARTED) return false;
-    const LA_FULLFILE input_file = input(rule_before);
-    const LA_FULLFILE output_file = file_made_by(*rule_);
-    const la_step_files files = {source_, input_file, output_file};
-    const Port::FileStatus output = la_status_of(output_file.get_fullfile());
-    if (output.exists && output.time >= la_status_of(before->output.c_str()).time) {
-      netlisters_->mark_stale(netlisters_->inputs_of(*rule_, files), files, output);
+    const char* output = output_of(*rule_);
+    const Port::FileStatus made = la_status_of(before->output.c_str());
+    const Port::FileStatus old = la_status_of(output);
+    if (!old.exists || old.time < made.time) return false;
+    if (!Port::File::settime(output, made.time - 1)) {
+      la_launcher_message().issueWarning(
+          "Launcher: %s was made again, and the time stamp of %s could not be set back: remove "
+          "it\n",
+          before->output.c_str(), output);
+      ++report_.warnings;
     }
     return false;
   }

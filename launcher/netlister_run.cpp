@@ -67,7 +67,7 @@ bool la_netlister_runs::run(const LA_RULE& rule, const la_step_files& files, LA_
 }
 
 Port::FileStatus la_netlister_runs::ask(const char* path) const {
-  return directory_.is_home() ? home_.status(path) : la_status_of(path);
+  return directory_.never_left() ? home_.status(path) : la_status_of(path);
 }
 
 /// Runs the command line and judges its exit code by the rule.
@@ -141,6 +141,10 @@ void la_netlister_runs::mind_changes(const std::vector<LA_EXPLANATION::SEEN>& be
   }
 }
 
+/// Sees to it that the output of a run that failed is never taken for up to date: gives it the
+/// oldest time stamp that there is. Its content stays for whoever wants to look into it. inputs and
+/// before: the files that the step depends on, and the output, as they were before the run. Goes
+/// home.
 void la_netlister_runs::mark_stale(const std::vector<LA_EXPLANATION::SEEN>& inputs,
                                    const la_step_files& files, const Port::FileStatus& before) {
   directory_.leave();

@@ -28,23 +28,19 @@ class la_netlister_runs {
   la_netlister_runs(const la_build_settings& settings, bool top, la_home& home,
                     const la_report& report);
 
-  /// Announces and runs the rule's netlister, and judges how it ended; result gets what there is
-  /// to know of it, and its command is empty if nothing was announced. Returns false, after an
-  /// error message, when the chain ends here.
+  /// Announces and runs the rule's netlister, and judges how it ended. result holds the rule, the
+  /// input and the output, and gets what else there is to know; its command is empty if nothing was
+  /// announced. Returns false, after an error message, when the chain ends here.
   bool run(const LA_RULE& rule, const la_step_files& files, LA_RUN& result);
   /// What is known of a file, wherever the process is.
   Port::FileStatus ask(const char* path) const;
-  /// The files that the step depends on: its input first.
-  std::vector<LA_EXPLANATION::SEEN> inputs_of(const LA_RULE& rule,
-                                              const la_step_files& files) const;
-  /// Sees to it that the output of a step that failed is never taken for up to date: gives it the
-  /// oldest time stamp that there is. Its content stays for whoever wants to look into it. before:
-  /// what was known of it before the run. Goes home for that.
-  void mark_stale(const std::vector<LA_EXPLANATION::SEEN>& inputs, const la_step_files& files,
-                  const Port::FileStatus& before);
 
  private:
+  std::vector<LA_EXPLANATION::SEEN> inputs_of(const LA_RULE& rule,
+                                              const la_step_files& files) const;
   bool execute(const LA_RULE& rule, LA_RUN& result) const;
+  void mark_stale(const std::vector<LA_EXPLANATION::SEEN>& inputs, const la_step_files& files,
+                  const Port::FileStatus& before);
   void mind_changes(const std::vector<LA_EXPLANATION::SEEN>& before, const la_step_files& files,
                     const LA_RUN& run) const;
 

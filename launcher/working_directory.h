@@ -25,8 +25,8 @@ class la_working_directory {
              const la_report& report);
   /// Goes home.
   void leave();
-  /// Whether the process has not left home.
-  bool is_home() const { return !left_; }
+  /// Whether the process has been home all the time.
+  bool never_left() const { return !left_; }
 
  private:
   const LA_DIR& home_;

@@ -65,7 +65,11 @@ bool File::settime(const char* path, __int64 time) {
 }
 
 bool File::setoldest(const char* path) {
-  return set_modification_time(path, {std::numeric_limits<time_t>::min(), 0});
+  // The first days of 1980 are the oldest that some file systems know. Some take any time, and
+  // keep none.
+  constexpr __int64 YEAR_1981 = 347'155'200 * SECOND;
+  return set_modification_time(path, {std::numeric_limits<time_t>::min(), 0}) &&
+         status(path).time < YEAR_1981;
 }
 
 bool File::remove(const char* path) {
