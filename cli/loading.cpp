@@ -5,6 +5,7 @@
 
 #include "cli/console.h"
 #include "cli/parts.h"
+#include "cli/place.h"
 #include "host/port_file.h"
 #include "host/port_pathlist.h"
 
@@ -39,6 +40,10 @@ void tell_of_loading(const LA_RULE_SET* rules, const settings& set, Port_MsgLeve
   if (!rules->is_valid && set.part != nullptr && tell_of_device_tables()) {
     const std::string wrong = wrong_with_part(set.part);
     if (!wrong.empty()) complain(wrong);
+  }
+  if (rules->unfinished_statement.line > 0) {
+    const std::string place = place_names().line(rules->unfinished_statement);
+    complain(place + ": the statement that begins here has no end");
   }
   if (rules->is_valid && rules->rules.count == 0) {
     complain(level, "there are no rules; looked for");
