@@ -47,7 +47,7 @@ std::string not_found::what_is_there(const std::string& name) const {
   for (const auto& [seen, given] : near) names.insert(seen);
   std::vector<std::string> meant = nearest_few(file.get_name(), names);
   const std::string head = name.substr(0, name.find_last_of("/\\") + 1);
-  for (std::string& word : meant) word = head + near.at(word);
+  for (std::string& word : meant) word = std::string(head).append(near.at(word));
   return meant.empty() ? "; see --explain" : did_you_mean(meant);
 }
 
