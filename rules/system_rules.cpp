@@ -78,7 +78,8 @@ class rule_maker {
     rule.origin = {path_, record.line};
     std::string_view rest = record.value;
     for (const la_rule_field& field : la_rule_fields()) {
-      read_field(rule, field, std::string(StaticAcdRead::take_piece(rest, ',')));
+      given_ = StaticAcdRead::take_piece(rest, ',');
+      read_field(rule, field);
       if (field.completes != nullptr) check_statuses(rule, *field.completes);
     }
     if (!StaticAcdRead::take_piece(rest, ',').empty()) {
@@ -87,15 +88,15 @@ class rule_maker {
     }
   }
 
-  void read_field(LA_RULE& rule, const la_rule_field& field, const std::string& given) {
+  void read_field(LA_RULE& rule, const la_rule_field& field) {
     const char* name = rule.rule_name;
-    if (given.empty() || UT_STR::ICompare(given.c_str(), "NONE") == 0) {
+    if (given_.empty() || UT_STR::ICompare(given_.c_str(), "NONE") == 0) {
       if (field.is_required) report(name, std::string(field.keyword) + " is required.", field.line);
     } else if (field.store == nullptr) {
-      read_dependency_files(rule, given);
-    } else if (given.size() >= LA_MAX_PATH) {
+      read_dependency_files(rule, given_);
+    } else if (given_.size() >= LA_MAX_PATH) {
       refuse_length(name, field.keyword);
-    } else if (!field.store(rule, given.c_str())) {
+    } else if (!field.store(rule, given_.c_str())) {
       report(name, std::string("Invalid exit code for ") + field.keyword + ".", field.line);
     }
   }
@@ -147,6 +148,7 @@ class rule_maker {
   std::string path_;
   StaticAcdRead reader_;
   DARRAY_LA_RULE_PTR& batch_;
+  std::string given_;  ///< the text of the current field; kept for the sake of its memory
   bool good_ = true;
 };
 
