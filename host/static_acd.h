@@ -36,8 +36,8 @@ class StaticAcdRead {
   Port::StringBase<char> GetStringByKey(const char* key, const char* separator, short index,
                                         const char* separator2, short index2) const;
 
-  /// The entry of key, which lives as long as this object; an empty one when there is none. For who
-  /// wants all fields of a value.
+  /// The entry of key, which lives as long as this object; an empty one when there is none. For
+  /// callers that want all fields of a value.
   const entry& find(std::string_view key) const;
   /// Takes the first field from the front of a value, which is null after the last one.
   static std::string_view take_piece(std::string_view& text, char separator) {

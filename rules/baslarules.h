@@ -31,8 +31,7 @@ class LA_RULE_SET {
   DARRAY_LA_RULE_PTR rules{11};
   /// Where the rules come from, in their order.
   std::vector<LA_RULES_FILE> files;
-  /// When "Unexpected end of file" was issued, where the statement begins that lacks its end; else
-  /// no line.
+  /// After "Unexpected end of file", the start of the statement that is cut off; else line 0.
   LA_ORIGIN unfinished_statement;
 
  private:

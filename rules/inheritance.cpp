@@ -57,8 +57,8 @@ void clear_none(LA_RULE& rule) {
 }  // namespace
 
 void inherit_from_later_rules(const DARRAY_LA_RULE_PTR& rules) {
-  // From the last rule to the first: the next one for the same extensions is complete by then. What
-  // it lacks has no later one either, or it is kept out.
+  // From the last rule to the first, the nearest later rule is complete already: what it lacks, no
+  // rule after it has, or its "NONE" keeps it out.
   std::unordered_map<std::string, LA_RULE*> nearest;
   for (int i = rules.count - 1; i >= 0; --i) {
     LA_RULE& rule = *rules.elements[i];

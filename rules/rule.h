@@ -120,7 +120,7 @@ class LA_RULE {
   DARRAY_LA_STATUS_PTR netlister_status{3};
   DARRAY_LA_STATUS_PTR checker_status{3};
   /// Where the rule begins: the file, as LA_RULE_SET::files names it, and the line of its RuleName
-  /// or of its record. No line for a rule that no loader made.
+  /// or record. Line 0 when no loader made the rule.
   LA_ORIGIN origin;
   bool is_inherited_from = false;  ///< an earlier rule has taken something from it
 };

@@ -13,13 +13,13 @@ struct la_rule_field {
   /// Stores text in the rule. False when it is not a valid status value. Null for the dependency
   /// files, of which only records of system rules hold a list.
   bool (*store)(LA_RULE& rule, const char* text);
-  /// The line that the finding of the system rules loader on this field is known by: that a
-  /// required field is missing, or that a status value is not valid.
+  /// The origin line of the system rules loader's finding on this field: it is required, or its
+  /// status value is not valid.
   int line = 0;
   bool is_required = false;
   /// The keyword in the message on a status value of a user rules file, where it is another one.
   const char* name_in_message = keyword;
-  /// The program whose exit-status entries are complete with this field.
+  /// The program whose exit-status entries end with this field.
   const la_program* completes = nullptr;
 };
 

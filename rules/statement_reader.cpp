@@ -32,7 +32,7 @@ la_statement_reader::item_kind la_statement_reader::next() {
     maybe_item item;
     const std::size_t blanks = rest_.find_first_not_of(BLANKS);
     if (blanks != rest_.npos) {
-      // Only in quotes the blanks count.
+      // Leading blanks count inside quotes only.
       if (state_ != QUOTED) rest_.remove_prefix(blanks);
       item = step();
     } else if (stream_.geteof()) {
@@ -55,7 +55,7 @@ la_statement_reader::maybe_item la_statement_reader::read_line() {
   ++line_number_;
   const auto kept = static_cast<int>(rest_.size());
   if (kept != length) {
-    // What stood on the line is not known. As a rule it ended a statement, and the next is read.
+    // The line's text is lost. Most likely it ended a statement, so a keyword comes next.
     rest_ = {};
     return go(KEYWORD, kept == LA_MAX_PATH - 1 ? LONG_LINE : ZERO_BYTE);
   }
@@ -74,7 +74,8 @@ la_statement_reader::maybe_item la_statement_reader::go(state next_state, maybe_
   return result;
 }
 
-/// One step on the rest of the line, which is not blank, nor begins with a blank but in quotes.
+/// Takes one step on the rest of the line, which is not blank and, outside quotes, begins with no
+/// blank.
 la_statement_reader::maybe_item la_statement_reader::step() {
   switch (state_) {
     case KEYWORD:
@@ -121,7 +122,7 @@ la_statement_reader::maybe_item la_statement_reader::step_value() {
   }
 }
 
-/// A value that is too long is refused once, and its quotes are still read to their end.
+/// A value that is too long is reported once, and read to its closing quote.
 la_statement_reader::maybe_item la_statement_reader::step_quoted() {
   const std::size_t quote = rest_.find('"');
   const std::string_view piece = rest_.substr(0, quote);

@@ -32,7 +32,7 @@ class la_statement_reader {
     UNEXPECTED_END,  ///< the file ends inside a statement, or while one is being dropped
   };
 
-  /// stream stays the caller's, and open as long as this object is used.
+  /// The caller keeps the stream, and keeps it open as long as this object is used.
   explicit la_statement_reader(Port::Stream& stream) : stream_(stream) {}
 
   /// The next statement or finding; END after the last one.
@@ -42,12 +42,12 @@ class la_statement_reader {
   const char* value() const { return value_.c_str(); }
   /// The line that was read last, from 1.
   int line() const { return line_number_; }
-  /// The line where the last statement began, whether it is complete, unfinished or being dropped.
+  /// The line where the last statement began, be it complete, unfinished or dropped.
   int statement_line() const { return statement_line_; }
 
  private:
-  /// What comes next: a keyword, "=", a value, the rest of a value in quotes, of one in quotes that
-  /// is too long, ";", what is dropped up to ";".
+  /// What is expected next. TOO_LONG is the rest of a quoted value that does not fit; SKIP drops
+  /// everything up to ";".
   enum state { KEYWORD, EQUALS, VALUE, QUOTED, TOO_LONG, SEMICOLON, SKIP };
   using maybe_item = std::optional<item_kind>;
 
@@ -65,7 +65,7 @@ class la_statement_reader {
   int line_number_ = 0;
   int statement_line_ = 0;
   char line_[LA_MAX_PATH] = "";
-  std::string_view rest_;  ///< what has not been taken of the line
+  std::string_view rest_;  ///< the part of the line that has not been taken yet
   std::string keyword_;
   std::string value_;
 };

@@ -6,10 +6,9 @@
 
 #include "rules/rule.h"
 
-/// Finds the system rules of a device's family, or for null the default ones, and reads and
-/// validates them; issues what it finds. Adds the rules to batch, and gives the path of their file;
-/// a family may be without one, and then has no rules. Returns whether there was no error; after
-/// one, the batch is not to be used.
+/// Reads and validates the system rules of a device's family, or for a null part_name the default
+/// ones, and issues what it finds. Adds the rules to batch and sets path to their file; a family
+/// without a file has no rules. Returns whether there was no error; after one, batch is of no use.
 bool la_load_system_rules(const char* part_name, DARRAY_LA_RULE_PTR& batch, std::string& path);
 
 #endif

@@ -10,7 +10,7 @@
 
 namespace {
 
-/// What is said of a line, by the finding of the statement reader.
+/// The text of a message on a line, by the finding of the statement reader.
 const char* finding_text(la_statement_reader::item_kind finding) {
   switch (finding) {
     case la_statement_reader::EXPECTING_KEYWORD:
@@ -86,7 +86,7 @@ class rule_maker {
 
   LA_ORIGIN statement_origin() const { return {rules_.path, reader_.statement_line()}; }
 
-  /// Issues a finding on the current line: a text, and perhaps an argument and what follows it.
+  /// Issues a finding on the current line: a text, perhaps an argument, and what follows it.
   void report(const char* text, const char* argument = "", const char* after = "",
               int line = __builtin_LINE()) {
     la_rules_message(line).issueError("Launcher: \"%s\", line %d: %s%s%s\n", file_name_,

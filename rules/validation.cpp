@@ -11,8 +11,8 @@
 
 namespace {
 
-/// The keywords that a template may use, with values that stand for those of a run. Keywords that
-/// may lack a value there lack it here, so that a template that needs one is found out.
+/// Sets the keywords that a template may use to stand-ins for a run's values. A keyword that may
+/// lack a value in a run has none here, so that a template that relies on it is refused.
 void fill_for_check(LA_KEYWORD_TABLE& table) {
   static constexpr struct {
     const char* keyword;
@@ -72,7 +72,7 @@ bool check_rule(const LA_RULE& rule, const LA_KEYWORD_TABLE& table) {
 /// Reports every pair of rules for the same netlist file and target, the earlier rule first.
 bool check_redefinitions(const DARRAY_LA_RULE_PTR& batch) {
   constexpr int NONE = -1;
-  // For each rule, the next one for the same conversion.
+  // By rule: the next rule for the same conversion.
   std::vector<int> next(static_cast<std::size_t>(batch.count), NONE);
   std::unordered_map<std::string, int> last;
   for (int i = 0; i < batch.count; ++i) {
