@@ -256,7 +256,7 @@ $ args 'a'"b c"'d' e" '"' f'g  | 0: [args][ab c'd'][e ''][f'g]\n/
 $ say=a kill=15                | 143: a\n/
 $ say=a close sleep=50 exit=4  | 4: a\n/
 sh -c "cat; printf 'a\nb'"     | 0: a\n/b/
-printf a\x00b\n\x00            | 0: a␀b\n/␀/
+printf a\x00\x00b\n\x00        | 0: a␀␀b\n/␀/
 '' $ say=a                     | "": the name of the program is empty
 x "y                           | x "y: a quote is without its partner
 x 'y                           | x 'y: a quote is without its partner)");
