@@ -1,10 +1,34 @@
 #include "cli/conflicts.h"
 
+#include <algorithm>
+
 #include "cli/console.h"
 #include "host/port_file.h"
+#include "host/ut_str.h"
 
-conflicts::conflicts(LA_LAUNCHER& launcher) : launcher_(launcher) {
-  launcher.ask_before_chains(may_build, this);
+namespace {
+
+/// What the outputs for a name are called, without extension and case.
+std::string stem_of(const std::string& name) {
+  std::string stem = name.substr(name.find_last_of("/\\") + 1);
+  stem.resize(std::min(stem.rfind('.'), stem.size()));
+  UT_STR::Lower(stem.data());
+  return stem;
+}
+
+}  // namespace
+
+conflicts::conflicts(LA_LAUNCHER& launcher, const std::vector<std::string>& names)
+    : launcher_(launcher) {
+  if (names.size() < 2) return;
+  for (const std::string& name : names) ++stems_[stem_of(name)];
+}
+
+void conflicts::begin(const std::string& name) {
+  name_ = name;
+  // Few names have the stem of another one: the chains of all others need not be asked about.
+  const bool may_meet = !stems_.empty() && stems_[stem_of(name)] > 1;
+  launcher_.ask_before_chains(may_meet ? may_build : nullptr, this);
 }
 
 conflicts::~conflicts() {
@@ -12,7 +36,7 @@ conflicts::~conflicts() {
 }
 
 unsigned char conflicts::may_build(void* self, const char* const* files, int count) {
-  auto& [launcher, name, origins] = *static_cast<conflicts*>(self);
+  auto& [launcher, stems, name, origins] = *static_cast<conflicts*>(self);
   for (int i = 1; i < count; ++i) {
     const char* input = files[i - 1];
     const auto known = origins.find(files[i]);

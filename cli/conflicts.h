@@ -4,6 +4,8 @@
 
 #include <map>
 #include <string>
+#include <unordered_map>
+#include <vector>
 
 #include "launcher/baslauncher.h"
 
@@ -11,14 +13,14 @@
 /// says so as an error.
 class conflicts {
  public:
-  /// The launcher must outlive this object.
-  explicit conflicts(LA_LAUNCHER& launcher);
+  /// The launcher must outlive this object. names: all of the call.
+  conflicts(LA_LAUNCHER& launcher, const std::vector<std::string>& names);
   conflicts(const conflicts&) = delete;
   conflicts& operator=(const conflicts&) = delete;
   ~conflicts();
 
   /// Whose chains come from now on.
-  void begin(const std::string& name) { name_ = name; }
+  void begin(const std::string& name);
 
  private:
   static unsigned char may_build(void* self, const char* const* files, int count);
@@ -28,6 +30,7 @@ class conflicts {
     std::string name;
   };
   LA_LAUNCHER& launcher_;
+  std::unordered_map<std::string, int> stems_;  ///< how many names have it
   std::string name_;
   std::map<std::string, origin> origins_;  ///< of what has been made
 };

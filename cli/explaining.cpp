@@ -12,7 +12,7 @@
 int explain(const settings& set) {
   LA_LAUNCHER launcher = launcher_of(set);
   tell_of_loading(launcher.rule_set(), set, PORT_MSG_WARNING);
-  conflicts between_names(launcher);
+  conflicts between_names(launcher, set.names);
   int status = launcher.ok ? ALL_FOUND : FAILED;
   std::string error;
   // The explanation says what the messages say, and the errors are its answers.

@@ -64,7 +64,7 @@ resolution resolved(LA_LAUNCHER& launcher, const std::string& name, bool top) {
   char netlist[LA_MAX_PATH];
   const __int64 start = now();
   found.result = launcher.find(name.c_str(), source, netlist, top);
-  reap_orphans();
+  if (!launcher.last_runs().empty()) reap_orphans();
   const bool is_all_written = tell_of_runs(name, launcher.last_runs(), start);
   if (found.result != LA_FOUND || !is_all_written) {
     if (found.result == LA_FOUND) found.result = LA_FAILED;
@@ -92,7 +92,7 @@ int resolve(const settings& set) {
   int status = launcher.ok ? ALL_FOUND : FAILED;
   tally counted;
   not_found missing(launcher.rule_set(), set.search_dirs);
-  conflicts between_names(launcher);
+  conflicts between_names(launcher, set.names);
   const signal_handling while_it_resolves;
   const auto goes_on = [] {
     return Port_Interrupt::Requested() == 0 && !console::has_lost_results();

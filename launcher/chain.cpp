@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <optional>
+#include <string>
 #include <utility>
 
 #include "file/full_root.h"
@@ -23,10 +24,10 @@ class chain_build {
         home_(home),
         report_(report),
         why_(why),
+        name_(LA_FILE(source_.get_tail()).get_name()),
         outputs_(settings.output_dir),
         input_status_(source.status) {
-    // As file_made_by does, takes a name like "d." for d without an extension.
-    outputs_.set_root(LA_FILE(source_.get_tail()).get_root());
+    outputs_.set_root(name_.c_str());
   }
 
   /// The full name of what a rule makes, good until the next call; null when there is none.
@@ -85,7 +86,7 @@ class chain_build {
     return rule_before != nullptr ? file_made_by(*rule_before) : source_;
   }
   /// Name and extension of what the step makes.
-  std::string output_tail() const { return file_made_by(*rule_).get_tail(); }
+  std::string output_tail() const { return name_ + "." + rule_->target->get_ext(); }
 
   /// Reports the decision. Returns false when it ends the chain.
   bool report_decision(const la_decision& decision, const LA_RULE* rule_before) {
@@ -161,7 +162,8 @@ class chain_build {
   la_home& home_;
   const la_report& report_;
   LA_EXPLANATION* const why_;
-  LA_FULLROOT outputs_;  ///< the outputs without their extensions
+  const std::string name_;  ///< of every output: that of a source "d." is d
+  LA_FULLROOT outputs_;     ///< the outputs without their extensions
 
   // Of the step that is being carried out.
   const LA_RULE* rule_ = nullptr;
