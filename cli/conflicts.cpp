@@ -36,7 +36,7 @@ conflicts::~conflicts() {
 }
 
 unsigned char conflicts::may_build(void* self, const char* const* files, int count) {
-  auto& [launcher, stems, name, origins] = *static_cast<conflicts*>(self);
+  auto& [launcher, stems, name, planned, origins] = *static_cast<conflicts*>(self);
   for (int i = 1; i < count; ++i) {
     const char* input = files[i - 1];
     const auto known = origins.find(files[i]);
@@ -48,6 +48,17 @@ unsigned char conflicts::may_build(void* self, const char* const* files, int cou
                                  known->second.name + " has it made from " + known->second.input);
     return 0;
   }
-  for (int i = 1; i < count; ++i) origins.insert({files[i], {files[i - 1], name}});
+  for (int i = 1; i < count; ++i) planned.insert({files[i], {files[i - 1], name}});
   return 1;
+}
+
+void conflicts::end(bool is_found) {
+  const std::vector<LA_RUN>& runs = launcher_.last_runs();
+  for (const auto& [file, from] : planned_) {
+    const bool ran = std::any_of(runs.begin(), runs.end(), [&output = file](const LA_RUN& run) {
+      return run.output == output;
+    });
+    if (is_found || ran) origins_.insert({file, from});
+  }
+  planned_.clear();
 }

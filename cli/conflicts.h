@@ -21,6 +21,8 @@ class conflicts {
 
   /// Whose chains come from now on.
   void begin(const std::string& name);
+  /// What its chain has made is taken; of one that failed, what netlisters ran for.
+  void end(bool is_found);
 
  private:
   static unsigned char may_build(void* self, const char* const* files, int count);
@@ -32,6 +34,7 @@ class conflicts {
   LA_LAUNCHER& launcher_;
   std::unordered_map<std::string, int> stems_;  ///< how many names have it
   std::string name_;
+  std::map<std::string, origin> planned_;  ///< by the chain of the moment
   std::map<std::string, origin> origins_;  ///< of what has been made
 };
 

@@ -29,6 +29,7 @@ int explain(const settings& set) {
     error.clear();
     between_names.begin(set.names[i]);
     const short result = launcher.find(set.names[i].c_str(), source, netlist, set.top);
+    between_names.end(result == LA_FOUND);
     console::print(explained({set.names[i], result, netlist, error}, why));
     console::flush();
     status = worse(status, result);

@@ -101,6 +101,7 @@ int resolve(const settings& set) {
     show_progress(i, set.names);
     between_names.begin(set.names[i]);
     const resolution found = resolved(launcher, set.names[i], set.top);
+    between_names.end(found.result == LA_FOUND);
     print_result(set, found);
     if (found.result == LA_NOT_FOUND) missing.tell(found.name);
     counted.add(found);
