@@ -184,8 +184,9 @@ bool may_build(const la_found_file& source, const DARRAY_LA_RULE_CONST_PTR& chai
     if (output == nullptr) return true;
     names.emplace_back(output);
   }
-  std::vector<const char*> files;
-  for (const std::string& name : names) files.push_back(name.c_str());
+  std::vector<const char*> files(names.size());
+  std::transform(names.begin(), names.end(), files.begin(),
+                 [](const std::string& name) { return name.c_str(); });
   return ask_host(files);
 }
 
