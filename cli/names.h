@@ -1,4 +1,4 @@
-// Names that stand in files.
+// Reads the files of names that --names-from gives.
 #ifndef KESTREL_CLI_NAMES_H
 #define KESTREL_CLI_NAMES_H
 

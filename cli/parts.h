@@ -1,4 +1,4 @@
-// Part names that are not valid.
+// Says what is wrong with a part name that is not valid.
 #ifndef KESTREL_CLI_PARTS_H
 #define KESTREL_CLI_PARTS_H
 

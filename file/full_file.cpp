@@ -1,3 +1,4 @@
+// LA_FULLFILE: a directory, and a file in it.
 #include <utility>
 
 #include "file/baslafile.h"

@@ -1,4 +1,4 @@
-// The origin of the launcher's messages.
+// Where the launcher's messages come from, and what each room reports by beside them.
 #ifndef KESTREL_LAUNCHER_MESSAGE_H
 #define KESTREL_LAUNCHER_MESSAGE_H
 

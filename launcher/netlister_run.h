@@ -1,5 +1,4 @@
-// Runs the netlisters of a chain, and sees to it that no file of theirs is taken for what it is
-// not.
+// Runs the netlisters of a chain; no output of a run that failed counts as up to date afterwards.
 #ifndef KESTREL_LAUNCHER_NETLISTER_RUN_H
 #define KESTREL_LAUNCHER_NETLISTER_RUN_H
 

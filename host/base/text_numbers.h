@@ -1,4 +1,4 @@
-// Numbers for texts.
+// Gives texts numbers, the same for equal ones, so that they can be compared and listed by number.
 #ifndef KESTREL_HOST_BASE_TEXT_NUMBERS_H
 #define KESTREL_HOST_BASE_TEXT_NUMBERS_H
 

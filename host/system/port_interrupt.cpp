@@ -1,3 +1,4 @@
+// Port_Interrupt: passes on signals to the child that runs.
 #include "host/port_interrupt.h"
 
 #include <signal.h>

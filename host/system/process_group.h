@@ -1,4 +1,4 @@
-// What lives in a process group.
+// Tells whether anything in a process group still lives.
 #ifndef KESTREL_HOST_SYSTEM_PROCESS_GROUP_H
 #define KESTREL_HOST_SYSTEM_PROCESS_GROUP_H
 
